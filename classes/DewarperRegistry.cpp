@@ -1,0 +1,180 @@
+#include "DewarperRegistry.h"
+
+#include <cstring>
+#include <new>
+
+#include "Sentry360Dewarper.h"
+
+DewarperRegistry DewarperRegistryInstance;
+
+DewarperRegistry::DewarpInfo::DewarpInfo()
+    : dll(nullptr),
+      name(""),
+      hasPosition(false),
+      hasLenses(false),
+      hasCircle(false),
+      cameraSpecific(false),
+      loaded(false) {}
+
+DewarperRegistry::DewarpInfo::DewarpInfo(DewarpInfo const& other) = default;
+
+DewarperRegistry::DewarpInfo& DewarperRegistry::DewarpInfo::operator=(DewarpInfo const& other) =
+    default;
+
+DewarperRegistry::DewarpInfo::~DewarpInfo() = default;
+
+template <typename T>
+void DewarperRegistry::Register(char const* dll, char const* name, bool hasPosition, bool hasLenses,
+                                bool hasCircle, bool cameraSpecific,
+                                DewarperType::DewarperTypes type) {
+    class DewarpInfoT : public DewarpInfo {
+    public:
+        IDewarper* Create(DewarpParams_t const& params) override {
+            return new (std::nothrow) T(params);
+        }
+        // Nothing is opened here: the kind's code is linked in.
+        bool DelayLoad() override { return true; }
+        void DelayUnload() override {}
+        void ForceUnload() override {}
+        int GetDefaultLens(int, char const*, char const*) override { return 0; }
+    };
+    DewarpInfo* const info = new DewarpInfoT;
+    info->dll = dll;
+    info->name = name;
+    info->hasPosition = hasPosition;
+    info->hasLenses = hasLenses;
+    info->hasCircle = hasCircle;
+    info->cameraSpecific = cameraSpecific;
+    info->loaded = false;
+    kinds[type] = info;
+}
+
+DewarperRegistry::DewarperRegistry() {
+    Register<Sentry360Dewarper>("360API.dll", "Sentry360", true, false, true, true,
+                                DewarperType::DewarperSentry360);
+}
+
+DewarperRegistry::~DewarperRegistry() {
+    for (auto const& entry : lensDewarpers) {
+        delete entry.second;
+    }
+    for (auto const& entry : kinds) {
+        entry.second->DelayUnload();
+    }
+    for (auto const& entry : kinds) {
+        entry.second->ForceUnload();
+        delete entry.second;
+    }
+    lensDewarpers.clear();
+    kinds.clear();
+}
+
+DewarperRegistry::DewarpInfo* DewarperRegistry::Find(int mode) const {
+    auto const found = kinds.find(mode);
+    return found == kinds.end() ? nullptr : found->second;
+}
+
+bool DewarperRegistry::IsCameraSpecific(int mode) {
+    DewarpInfo const* const info = Find(mode);
+    return info != nullptr && info->cameraSpecific;
+}
+
+void DewarperRegistry::GetSupportedFeatures(int mode, bool& hasLenses, bool& hasCircle,
+                                            bool& hasPosition) {
+    DewarpInfo const* const info = Find(mode);
+    hasLenses = info != nullptr && info->hasLenses;
+    hasCircle = info != nullptr && info->hasCircle;
+    hasPosition = info != nullptr && info->hasPosition;
+}
+
+// A failed load is not remembered, so the next call tries again.
+bool DewarperRegistry::IsLoaded(int mode) {
+    DewarpInfo* const info = Find(mode);
+    if (info == nullptr) {
+        return false;
+    }
+    if (!info->loaded) {
+        info->loaded = info->DelayLoad();
+    }
+    return info->loaded;
+}
+
+char const* DewarperRegistry::GetName(int mode) {
+    DewarpInfo const* const info = Find(mode);
+    return info == nullptr ? "" : info->name;
+}
+
+// The lens list is an operation of a dewarper, so one hidden dewarper per kind is kept to answer
+// it. It never sees a frame.
+int DewarperRegistry::GetLens(int mode, int lens, char* buffer, unsigned long size) {
+    DewarpInfo const* const info = Find(mode);
+    if (info == nullptr || !info->hasLenses) {
+        return 0;
+    }
+    try {
+        IDewarper*& dewarper = lensDewarpers[mode];
+        if (dewarper == nullptr) {
+            DewarpParams_t const params;
+            dewarper = CreateDewarper(mode, params);
+            if (dewarper == nullptr) {
+                return 0;
+            }
+        }
+        return dewarper->GetLens(lens, buffer, size);
+    } catch (std::bad_alloc const&) {
+        return 0;  // the map could not grow; nothing may leave the library
+    }
+}
+
+int DewarperRegistry::GetModeCount() {
+    return MODE_COUNT;
+}
+
+int DewarperRegistry::GetModeByName(char const* name) {
+    if (name == nullptr) {
+        return DewarperType::DewarperNone;
+    }
+    for (auto const& entry : kinds) {
+        if (strcmp(entry.second->name, name) == 0) {
+            return entry.first;
+        }
+    }
+    return DewarperType::DewarperNone;
+}
+
+// The camera table joins with the camera-selection code; until then no camera has a dewarper.
+int DewarperRegistry::GetModeByCamera(char const*, char const*, char const*) {
+    return DewarperType::DewarperNone;
+}
+
+int DewarperRegistry::GetDefaultLens(int mode, char const* make, char const* model) {
+    DewarpInfo* const info = Find(mode);
+    return info == nullptr ? 0 : info->GetDefaultLens(mode, make, model);
+}
+
+IDewarper* DewarperRegistry::Create(DewarperType::DewarperTypes type,
+                                    DewarpParams_t const& params) {
+    DewarpInfo* const info = Find(type);
+    if (info == nullptr) {
+        return nullptr;
+    }
+    IDewarper* const dewarper = info->Create(params);
+    if (dewarper != nullptr) {
+        dewarper->SetDewarperType(type);
+    }
+    return dewarper;
+}
+
+IDewarper* DewarperRegistry::LoadAndCreate(int type, DewarpParams_t const& params) {
+    DewarpInfo* const info = Find(type);
+    if (info == nullptr) {
+        return nullptr;
+    }
+    if (!info->loaded) {
+        info->loaded = info->DelayLoad();
+        if (!info->loaded) {
+            return nullptr;
+        }
+    }
+    return Create(static_cast<DewarperType::DewarperTypes>(type), params);
+}

@@ -1,0 +1,17 @@
+# Fails unless the plug-in's dynamic symbol table defines exactly the four exported functions.
+execute_process(COMMAND nm -D --defined-only ${PLUGIN}
+                OUTPUT_VARIABLE symbols RESULT_VARIABLE status)
+if(NOT status EQUAL 0)
+    message(FATAL_ERROR "nm failed on ${PLUGIN}")
+endif()
+string(REGEX MATCHALL "[^\n]+" lines "${symbols}")
+set(names "")
+foreach(line IN LISTS lines)
+    string(REGEX REPLACE "^[0-9a-fA-F]* *[A-Za-z] " "" name "${line}")
+    list(APPEND names "${name}")
+endforeach()
+list(SORT names)
+set(expected CreateDewarper DeleteDewarper DewarperLoaded GetRegister)
+if(NOT names STREQUAL expected)
+    message(FATAL_ERROR "exported: ${names}\nexpected: ${expected}")
+endif()
