@@ -1,0 +1,173 @@
+#include <cstring>
+#include <dlfcn.h>
+#include <memory>
+
+#include <gtest/gtest.h>
+
+#include "host_side_interfaces.h"
+
+namespace {
+
+using host_side::CameraRecord;
+using host_side::Dewarper;
+using host_side::Registry;
+
+constexpr int SENTRY360 = 2;
+
+// The plug-in opened as a client opens it, with its four exports resolved by name.
+class BinaryContractTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        library = dlopen(VEXMAP_PLUGIN_PATH, RTLD_NOW | RTLD_LOCAL);
+        ASSERT_NE(nullptr, library) << dlerror();
+        getRegister = reinterpret_cast<Registry* (*)()>(dlsym(library, "GetRegister"));
+        createDewarper = reinterpret_cast<Dewarper* (*)(int, CameraRecord const&)>(
+            dlsym(library, "CreateDewarper"));
+        dewarperLoaded = reinterpret_cast<bool (*)(int)>(dlsym(library, "DewarperLoaded"));
+        deleteDewarper = reinterpret_cast<void (*)(Dewarper*)>(dlsym(library, "DeleteDewarper"));
+        ASSERT_NE(nullptr, getRegister);
+        ASSERT_NE(nullptr, createDewarper);
+        ASSERT_NE(nullptr, dewarperLoaded);
+        ASSERT_NE(nullptr, deleteDewarper);
+    }
+
+    void TearDown() override {
+        if (library != nullptr) {
+            dlclose(library);
+        }
+    }
+
+    Dewarper* CreateSentry360() {
+        CameraRecord record{};
+        record.position = 1;
+        record.circleX = 32;
+        record.circleY = 32;
+        record.circleRadius = 32;
+        return createDewarper(SENTRY360, record);
+    }
+
+    void* library = nullptr;
+    Registry* (*getRegister)() = nullptr;
+    Dewarper* (*createDewarper)(int, CameraRecord const&) = nullptr;
+    bool (*dewarperLoaded)(int) = nullptr;
+    void (*deleteDewarper)(Dewarper*) = nullptr;
+};
+
+TEST_F(BinaryContractTest, ExportsAreFoundByTheirPlainNames) {
+    EXPECT_EQ(nullptr, dlsym(library, "_Z11GetRegisterv"));
+    EXPECT_EQ(nullptr, dlsym(library, "DewarperRegistryInstance"));
+}
+
+TEST_F(BinaryContractTest, RegistrySlotsAnswerInTheirOrder) {
+    Registry* registry = getRegister();
+    ASSERT_NE(nullptr, registry);
+    EXPECT_EQ(registry, getRegister());
+    EXPECT_TRUE(registry->IsCameraSpecific(SENTRY360));
+    EXPECT_FALSE(registry->IsCameraSpecific(5));
+    bool lenses = true;
+    bool circle = false;
+    bool position = false;
+    registry->GetSupportedFeatures(SENTRY360, lenses, circle, position);
+    EXPECT_FALSE(lenses);
+    EXPECT_TRUE(circle);
+    EXPECT_TRUE(position);
+    EXPECT_TRUE(registry->IsLoaded(SENTRY360));
+    EXPECT_FALSE(registry->IsLoaded(4));
+    EXPECT_STREQ("Sentry360", registry->GetName(SENTRY360));
+    EXPECT_STREQ("", registry->GetName(4));
+    char buffer[16] = "untouched";
+    EXPECT_EQ(0, registry->GetLens(SENTRY360, 0, buffer, sizeof buffer));
+    EXPECT_STREQ("untouched", buffer);
+    EXPECT_EQ(17, registry->GetModeCount());
+    EXPECT_EQ(SENTRY360, registry->GetModeByName("Sentry360"));
+    EXPECT_EQ(0, registry->GetModeByCamera("", "", ""));
+    EXPECT_EQ(0, registry->GetDefaultLens(SENTRY360, "", ""));
+    CameraRecord const record{};
+    Dewarper* dewarper = registry->Create(SENTRY360, record);
+    ASSERT_NE(nullptr, dewarper);
+    EXPECT_EQ(SENTRY360, dewarper->Mode());
+    deleteDewarper(dewarper);
+    EXPECT_EQ(nullptr, registry->Create(10, record));
+}
+
+TEST_F(BinaryContractTest, ExportedFunctionsFollowTheRegistry) {
+    EXPECT_TRUE(dewarperLoaded(SENTRY360));
+    EXPECT_FALSE(dewarperLoaded(10));
+    CameraRecord const record{};
+    EXPECT_EQ(nullptr, createDewarper(10, record));
+    deleteDewarper(nullptr);
+}
+
+TEST_F(BinaryContractTest, DewarperQuerySlotsAnswerInTheirOrder) {
+    Dewarper* dewarper = CreateSentry360();
+    ASSERT_NE(nullptr, dewarper);
+    EXPECT_EQ(SENTRY360, dewarper->Mode());
+    EXPECT_TRUE(dewarper->Check());
+    EXPECT_EQ(1, dewarper->SubMode());
+    EXPECT_TRUE(dewarper->IsSubModeSupported(2));
+    EXPECT_FALSE(dewarper->IsSubModeSupported(3));
+    EXPECT_FALSE(dewarper->IsNormalPTZSupported(1));
+    EXPECT_TRUE(dewarper->IsNormalPTZSupported(3));
+    EXPECT_TRUE(dewarper->CanPan(2));
+    EXPECT_TRUE(dewarper->CanTilt(2));
+    EXPECT_TRUE(dewarper->CanZoom(2));
+    EXPECT_FALSE(dewarper->GetNeedsRotation());
+    EXPECT_FALSE(dewarper->GetFlipVertical());
+    EXPECT_FALSE(dewarper->GetFlipHorizontal());
+    EXPECT_EQ(3.0f, dewarper->AdjustAspectRatio(4.0f, 3.0f));
+    EXPECT_EQ(32, dewarper->Parameters()->circleRadius);
+    EXPECT_EQ(1, dewarper->Parameters()->position);
+    char buffer[4] = "abc";
+    EXPECT_EQ(0, dewarper->GetLens(0, buffer, sizeof buffer));
+    dewarper->SetDewarperType(7);
+    EXPECT_EQ(SENTRY360, dewarper->Mode());
+    dewarper->SetSubMode(2);
+    EXPECT_EQ(2, dewarper->SubMode());
+    EXPECT_FALSE(dewarper->CanPan(1));
+    EXPECT_FLOAT_EQ(16.0f / 9.0f, dewarper->AdjustAspectRatio(4.0f, 3.0f));
+    deleteDewarper(dewarper);
+}
+
+TEST_F(BinaryContractTest, DewarperPositionSlotsMoveThePositionInTheirOrder) {
+    Dewarper* dewarper = CreateSentry360();
+    ASSERT_NE(nullptr, dewarper);
+    float pan = -1;
+    float tilt = -1;
+    float zoom = -1;
+    dewarper->SetPosition(10.0f, 20.0f, 2.0f);
+    dewarper->Pan(1, 0);
+    dewarper->Tilt(1, 4);
+    dewarper->Zoom(1, 1);
+    dewarper->GetPosition(pan, tilt, zoom);
+    EXPECT_FLOAT_EQ(10.2f, pan);
+    EXPECT_FLOAT_EQ(19.0f, tilt);
+    EXPECT_FLOAT_EQ(2.1f, zoom);
+    dewarper->Clear();
+    dewarper->GetPosition(pan, tilt, zoom);
+    EXPECT_EQ(0.0f, pan);
+    EXPECT_FLOAT_EQ(0.7f, zoom);
+    deleteDewarper(dewarper);
+}
+
+TEST_F(BinaryContractTest, AFrameGoesInAndComesOutDewarped) {
+    Dewarper* dewarper = CreateSentry360();
+    ASSERT_NE(nullptr, dewarper);
+    unsigned char* input = nullptr;
+    unsigned int size = 0;
+    int format = -1;
+    ASSERT_TRUE(dewarper->GetImageInputBuffer(64, 64, &input, &size, &format));
+    EXPECT_EQ(3, format);
+    ASSERT_EQ(64u * 64u * 3u, size);
+    memset(input, 180, size);
+    int width = 41;
+    int height = 21;
+    unsigned char* output = nullptr;
+    ASSERT_TRUE(dewarper->GetImageOutputBuffer(&width, &height, &output, &size, &format));
+    EXPECT_EQ(48, width);
+    EXPECT_EQ(22, height);
+    EXPECT_EQ(48u * 22u * 3u, size);
+    EXPECT_EQ(180, output[(11 * 48 + 24) * 3]);
+    deleteDewarper(dewarper);
+}
+
+}  // namespace
