@@ -16,8 +16,8 @@ constexpr uint32_t NO_PIXEL = ImageProcessorPrivateData::NO_PIXEL;
 // A processor that owns all three pictures, the outputs of one size, 24 bits a pixel.
 class ImageProcessorTest : public ::testing::Test {
 protected:
-    void SetUp(int input_width, int input_height, int circle_x, int circle_y, int radius,
-               int output_width, int output_height, int interpolation, bool flip = false) {
+    void Configure(int input_width, int input_height, int circle_x, int circle_y, int radius,
+                   int output_width, int output_height, int interpolation, bool flip = false) {
         params.InputWidth = input_width;
         params.InputHeight = input_height;
         params.InputStride = input_width * 3;
@@ -135,7 +135,7 @@ TEST_F(ImageProcessorTest, TiltBeyondAQuarterTurnAborts) {
 }
 
 TEST_F(ImageProcessorTest, MiddleOfASameSizedOutputShowsTheMiddleOfTheCircle) {
-    SetUp(64, 64, 32, 32, 32, 64, 64, 0);
+    Configure(64, 64, 32, 32, 32, 64, 64, 0);
     FillNumbered();
     processor.ProcessImage();
     EXPECT_EQ(Input(32, 32), Ptz(32, 32));
@@ -143,7 +143,7 @@ TEST_F(ImageProcessorTest, MiddleOfASameSizedOutputShowsTheMiddleOfTheCircle) {
 }
 
 TEST_F(ImageProcessorTest, OutputTopShowsTheTopOfTheCircleAtPanZero) {
-    SetUp(64, 64, 32, 32, 32, 64, 64, 0);
+    Configure(64, 64, 32, 32, 32, 64, 64, 0);
     FillNumbered();
     processor.ProcessImage();
     EXPECT_LT(Ptz(0, 32)[1], Ptz(63, 32)[1]);  // green counts input rows
@@ -151,7 +151,7 @@ TEST_F(ImageProcessorTest, OutputTopShowsTheTopOfTheCircleAtPanZero) {
 }
 
 TEST_F(ImageProcessorTest, PanHalfATurnShowsTheCircleUpsideDown) {
-    SetUp(64, 64, 32, 32, 32, 64, 64, 0);
+    Configure(64, 64, 32, 32, 32, 64, 64, 0);
     FillNumbered();
     processor.SetPan(180);
     processor.ProcessImage();
@@ -162,7 +162,7 @@ TEST_F(ImageProcessorTest, PanHalfATurnShowsTheCircleUpsideDown) {
 TEST_F(ImageProcessorTest, PixelsOutsideTheCircleAreBlackAlsoWithInterpolation) {
     // A full tilt moves the view by 30 degrees: the upper rows fall outside the circle, the
     // lower ones stay inside.
-    SetUp(64, 64, 32, 32, 32, 64, 64, 1);
+    Configure(64, 64, 32, 32, 32, 64, 64, 1);
     FillWhite();
     processor.SetTilt(90);
     processor.ProcessImage();
@@ -175,7 +175,7 @@ TEST_F(ImageProcessorTest, PixelsOutsideTheCircleAreBlackAlsoWithInterpolation) 
 
 TEST_F(ImageProcessorTest, RowsBehindTheLensAreBlackWithoutALookup) {
     // At full tilt a row lies behind the lens when its offset is below -f / tan(30 degrees).
-    SetUp(128, 128, 64, 64, 64, 128, 128, 0);
+    Configure(128, 128, 64, 64, 64, 128, 128, 0);
     FillWhite();
     processor.SetPanTiltZoom(0, 90, 0.25);
     processor.ProcessImage();
@@ -187,7 +187,7 @@ TEST_F(ImageProcessorTest, RowsBehindTheLensAreBlackWithoutALookup) {
 TEST_F(ImageProcessorTest, InputPixelInTheLastColumnIsCopiedNeverBlended) {
     // The circle's centre is the input's last column; one output column to the right lands a
     // fraction past it.
-    SetUp(64, 64, 63, 32, 32, 64, 64, 1);
+    Configure(64, 64, 63, 32, 32, 64, 64, 1);
     FillNumbered();
     processor.ProcessImage();
     uint32_t const entry = PtzEntry(32, 33);
@@ -196,7 +196,7 @@ TEST_F(ImageProcessorTest, InputPixelInTheLastColumnIsCopiedNeverBlended) {
 }
 
 TEST_F(ImageProcessorTest, InputPixelInTheLastRowIsCopiedNeverBlended) {
-    SetUp(64, 64, 32, 63, 32, 64, 64, 1);
+    Configure(64, 64, 32, 63, 32, 64, 64, 1);
     FillNumbered();
     processor.ProcessImage();
     ASSERT_EQ(uint32_t(63 << 16 | 32), PtzEntry(33, 32));
@@ -204,7 +204,7 @@ TEST_F(ImageProcessorTest, InputPixelInTheLastRowIsCopiedNeverBlended) {
 }
 
 TEST_F(ImageProcessorTest, InterpolationOneBlendsOnTheFrameThatWorksTheMapOut) {
-    SetUp(64, 64, 32, 32, 32, 64, 64, 1);
+    Configure(64, 64, 32, 32, 32, 64, 64, 1);
     FillNumbered();
     processor.SetZoom(0.5);
     processor.ProcessImage();
@@ -218,7 +218,7 @@ TEST_F(ImageProcessorTest, InterpolationOneBlendsOnTheFrameThatWorksTheMapOut) {
 }
 
 TEST_F(ImageProcessorTest, InterpolationTwoIsNearestOnANewMapAndBlendedOnItsReplay) {
-    SetUp(64, 64, 32, 32, 32, 64, 64, 2);
+    Configure(64, 64, 32, 32, 32, 64, 64, 2);
     FillNumbered();
     processor.SetZoom(0.5);
     processor.ProcessImage();
@@ -236,7 +236,7 @@ TEST_F(ImageProcessorTest, InterpolationTwoIsNearestOnANewMapAndBlendedOnItsRepl
 }
 
 TEST_F(ImageProcessorTest, AnUnchangedPositionReplaysTheMapAndANewOneWorksItOutAgain) {
-    SetUp(64, 64, 32, 32, 32, 64, 64, 0);
+    Configure(64, 64, 32, 32, 32, 64, 64, 0);
     FillNumbered();
     processor.SetPanTiltZoom(10, 20, 1.5);
     processor.ProcessImage();
@@ -255,7 +255,7 @@ TEST_F(ImageProcessorTest, AnUnchangedPositionReplaysTheMapAndANewOneWorksItOutA
 }
 
 TEST_F(ImageProcessorTest, ReplayTakesTheInputOfTheNewFrame) {
-    SetUp(64, 64, 32, 32, 32, 64, 64, 0);
+    Configure(64, 64, 32, 32, 32, 64, 64, 0);
     FillNumbered();
     processor.ProcessImage();
     FillWhite();
@@ -264,7 +264,7 @@ TEST_F(ImageProcessorTest, ReplayTakesTheInputOfTheNewFrame) {
 }
 
 TEST_F(ImageProcessorTest, FlipMirrorsTheLookupsWhileTheMapIndexStaysTheOutputsOwn) {
-    SetUp(64, 64, 32, 32, 32, 64, 48, 0);
+    Configure(64, 64, 32, 32, 32, 64, 48, 0);
     FillNumbered();
     processor.SetPanTiltZoom(30, 40, 0.8);
     processor.ProcessImage();
@@ -276,7 +276,7 @@ TEST_F(ImageProcessorTest, FlipMirrorsTheLookupsWhileTheMapIndexStaysTheOutputsO
             straight.push_back(Ptz(row, column));
         }
     }
-    SetUp(64, 64, 32, 32, 32, 64, 48, 0, true);
+    Configure(64, 64, 32, 32, 32, 64, 48, 0, true);
     FillNumbered();
     processor.ProcessImage();
     for (int row = 0; row < 48; ++row) {
@@ -289,7 +289,7 @@ TEST_F(ImageProcessorTest, FlipMirrorsTheLookupsWhileTheMapIndexStaysTheOutputsO
 }
 
 TEST_F(ImageProcessorTest, ASecondSetParametersWithTheSameValuesDropsTheMaps) {
-    SetUp(64, 64, 32, 32, 32, 64, 64, 0);
+    Configure(64, 64, 32, 32, 32, 64, 64, 0);
     FillNumbered();
     processor.ProcessImage();
     processor.ProcessPanoramaImage();
@@ -299,7 +299,7 @@ TEST_F(ImageProcessorTest, ASecondSetParametersWithTheSameValuesDropsTheMaps) {
 }
 
 TEST_F(ImageProcessorTest, RadiusOfZeroGivesABlackPanoramaAndABlackView) {
-    SetUp(64, 64, 32, 32, 0, 64, 64, 2);
+    Configure(64, 64, 32, 32, 0, 64, 64, 2);
     FillWhite();
     for (int frame = 0; frame < 2; ++frame) {
         processor.ProcessImage();
@@ -310,21 +310,21 @@ TEST_F(ImageProcessorTest, RadiusOfZeroGivesABlackPanoramaAndABlackView) {
 }
 
 TEST_F(ImageProcessorTest, OutputWithoutPixelsIsLeftAlone) {
-    SetUp(64, 64, 32, 32, 32, 0, 0, 0);
+    Configure(64, 64, 32, 32, 32, 0, 0, 0);
     processor.ProcessImage();
     processor.ProcessPanoramaImage();
     EXPECT_FALSE(processor.PrivateData().PtzMapValid);
 }
 
 TEST_F(ImageProcessorTest, AnInputOfNoPixelsGivesABlackView) {
-    SetUp(0, 0, 0, 0, 32, 16, 16, 2);
+    Configure(0, 0, 0, 0, 32, 16, 16, 2);
     processor.ProcessImage();
     EXPECT_TRUE(AllBlack(processor.PtzOutput()));
     EXPECT_EQ(NO_PIXEL, PtzEntry(8, 8));
 }
 
 TEST_F(ImageProcessorTest, PanoramaMapIsMadeOnceAndDependsOnNoPosition) {
-    SetUp(64, 64, 32, 32, 32, 32, 32, 0);
+    Configure(64, 64, 32, 32, 32, 32, 32, 0);
     FillNumbered();
     processor.ProcessPanoramaImage();
     EXPECT_TRUE(processor.PrivateData().PanoramaMapValid);
@@ -335,7 +335,7 @@ TEST_F(ImageProcessorTest, PanoramaMapIsMadeOnceAndDependsOnNoPosition) {
 }
 
 TEST_F(ImageProcessorTest, PanoramaRowsRunFromTheRimOfTheCircleTowardsItsCentre) {
-    SetUp(200, 200, 100, 100, 100, 100, 100, 0);
+    Configure(200, 200, 100, 100, 100, 100, 100, 0);
     FillNumbered();
     processor.ProcessPanoramaImage();
     double const pi = std::acos(-1.0);
@@ -352,11 +352,11 @@ TEST_F(ImageProcessorTest, PanoramaRowsRunFromTheRimOfTheCircleTowardsItsCentre)
 }
 
 TEST_F(ImageProcessorTest, FlippedPanoramaMirrorsRowsAndColumns) {
-    SetUp(64, 64, 32, 32, 32, 32, 32, 0);
+    Configure(64, 64, 32, 32, 32, 32, 32, 0);
     FillNumbered();
     processor.ProcessPanoramaImage();
     std::vector<uint32_t> const straight = processor.PrivateData().PanoramaMap;
-    SetUp(64, 64, 32, 32, 32, 32, 32, 0, true);
+    Configure(64, 64, 32, 32, 32, 32, 32, 0, true);
     FillNumbered();
     processor.ProcessPanoramaImage();
     std::vector<uint32_t> const& flipped = processor.PrivateData().PanoramaMap;
@@ -365,7 +365,7 @@ TEST_F(ImageProcessorTest, FlippedPanoramaMirrorsRowsAndColumns) {
 }
 
 TEST_F(ImageProcessorTest, PanoramaReplayBlendsWithInterpolationTwo) {
-    SetUp(64, 64, 32, 32, 32, 32, 32, 2);
+    Configure(64, 64, 32, 32, 32, 32, 32, 2);
     FillNumbered();
     processor.ProcessPanoramaImage();
     std::size_t const index = 10 * 32 + 5;
@@ -381,7 +381,7 @@ TEST_F(ImageProcessorTest, PanoramaReplayBlendsWithInterpolationTwo) {
 
 TEST_F(ImageProcessorTest, PanoramaLookupsThatLeaveThePictureAreBlack) {
     // The circle's centre lies near the left edge: half a turn round it leaves the picture.
-    SetUp(64, 64, 10, 32, 32, 32, 32, 0);
+    Configure(64, 64, 10, 32, 32, 32, 32, 0);
     FillWhite();
     processor.ProcessPanoramaImage();
     EXPECT_EQ((Rgb{255, 255, 255}), Panorama(0, 0));
@@ -390,7 +390,7 @@ TEST_F(ImageProcessorTest, PanoramaLookupsThatLeaveThePictureAreBlack) {
 }
 
 TEST_F(ImageProcessorTest, InputAndOutputImagesCopyWholePictures) {
-    SetUp(4, 2, 2, 1, 1, 8, 2, 0);
+    Configure(4, 2, 2, 1, 1, 8, 2, 0);
     ImageData picture;
     picture.Width = 4;
     picture.Height = 2;
@@ -411,7 +411,7 @@ TEST_F(ImageProcessorTest, InputAndOutputImagesCopyWholePictures) {
 }
 
 TEST_F(ImageProcessorTest, OwnedOutputsBecomeUnownedWhenTheParametersSaySo) {
-    SetUp(4, 4, 2, 2, 2, 8, 4, 0);
+    Configure(4, 4, 2, 2, 2, 8, 4, 0);
     EXPECT_TRUE(processor.PtzOutput().OwnsData);
     ImageProcessorParams borrowed = params;
     borrowed.OwnOutput = false;
