@@ -3,7 +3,7 @@
 set -euo pipefail
 
 packages=(
-    build-essential g++ clang cmake ninja-build pkg-config binutils
+    build-essential g++ clang clang-format cmake ninja-build pkg-config binutils
     libboost-dev libgtest-dev libgmock-dev libbenchmark-dev
     libpng-dev libturbojpeg0-dev libcli11-dev
 )

@@ -184,8 +184,7 @@ int Run(Options const& options) {
 
 void AddOptions(CLI::App& app, Options& options) {
     app.add_option("--input", options.input,
-                   "PNG or JPEG fisheye picture (default: built-in sample)")
-        ->check(CLI::ExistingFile);
+                   "PNG or JPEG fisheye picture (default: built-in sample)");
     auto* mode = app.add_option("--mode", options.mode, "dewarper mode number");
     app.add_option("--kind", options.kind, "dewarper kind by display name (default: Sentry360)")
         ->excludes(mode);

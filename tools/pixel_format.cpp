@@ -28,6 +28,10 @@ void PixelFormat::RequireSize(int width, int height, std::size_t size) const {
 
 void PixelFormat::Encode(RgbImage const& image, unsigned char* buffer, std::size_t size) const {
     RequireSize(image.width, image.height, size);
+    if (image.pixels.size() != size) {
+        throw ToolError("the picture holds " + std::to_string(image.pixels.size()) +
+                        " bytes, not the " + std::to_string(size) + " of its size");
+    }
     std::copy(image.pixels.begin(), image.pixels.end(), buffer);
 }
 
