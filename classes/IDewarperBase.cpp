@@ -38,19 +38,29 @@ int64_t TruncateSaturated(float value) {
     return value < LIMIT ? int64_t(value) : int64_t(LIMIT);
 }
 
-// Wraps a value into [min, max) when asked, then clamps it; NaN ends at `min`.
-float LimitToRange(float value, float min, float max, bool wrap) {
-    if (wrap) {
-        float const range = max - min;
-        int64_t const whole_range = TruncateSaturated(range);
-        if (value < min && whole_range != 0) {
-            int64_t const turns = TruncateSaturated(min - value) / whole_range + 1;
-            value += float(turns) * range;
-        }
-        value = std::fmod(value - min, range) + min;
-    }
-    return std::min(std::max(min, value), max);
+// The distance of one step: a fifth of a unit on every range whose span equals its step.
+float StepSize(IDewarperBase::AxisRange const& range) {
+    return (range.max - range.min) / (range.step / 0.2f);
 }
+
+// Wraps a value into [min, max) when the axis turns round, then clamps it; NaN ends at `min`.
+float LimitToRange(float value, IDewarperBase::AxisRange const& range) {
+    if (range.wrap) {
+        float const span = range.max - range.min;
+        int64_t const whole_span = TruncateSaturated(span);
+        if (value < range.min && whole_span != 0) {
+            int64_t const turns = TruncateSaturated(range.min - value) / whole_span + 1;
+            value += float(turns) * span;
+        }
+        value = std::fmod(value - range.min, span) + range.min;
+    }
+    return std::min(std::max(range.min, value), range.max);
+}
+
+constexpr IDewarperBase::AxisRange WALL_RANGE{-90.0f, 90.0f, 180.0f, false};
+constexpr IDewarperBase::AxisRange FULL_TURN{0.0f, 360.0f, 360.0f, true};
+constexpr IDewarperBase::AxisRange UPPER_QUARTER{0.0f, 90.0f, 90.0f, false};
+constexpr IDewarperBase::AxisRange LOWER_QUARTER{-90.0f, 0.0f, 90.0f, false};
 
 }  // namespace
 
@@ -103,24 +113,14 @@ bool IDewarperBase::CanZoom(int) {
 
 // One step is 0.2 units on every range whose span equals its step.
 void IDewarperBase::Pan(int direction, int speed) {
-    float min = 0.0f;
-    float max = 0.0f;
-    float step = 0.0f;
-    bool wrap = false;
-    GetPanRange(min, max, step, wrap);
-    float const delta = StepCount(direction, speed) * ((max - min) / (step / 0.2f));
+    float const delta = StepCount(direction, speed) * StepSize(PanRange());
     pan += InvertPan() ? -delta : delta;
     LimitAndUpdatePosition();
 }
 
 // A positive direction lowers tilt: the opposite sign of Pan is intended.
 void IDewarperBase::Tilt(int direction, int speed) {
-    float min = 0.0f;
-    float max = 0.0f;
-    float step = 0.0f;
-    bool wrap = false;
-    GetTiltRange(min, max, step, wrap);
-    float const delta = -StepCount(direction, speed) * ((max - min) / (step / 0.2f));
+    float const delta = -StepCount(direction, speed) * StepSize(TiltRange());
     tilt += InvertTilt() ? -delta : delta;
     LimitAndUpdatePosition();
 }
@@ -261,53 +261,31 @@ bool IDewarperBase::InvertTilt() {
     return false;
 }
 
+void IDewarperBase::Report(AxisRange const& range, float& min, float& max, float& step,
+                           bool& wrap) {
+    min = range.min;
+    max = range.max;
+    step = range.step;
+    wrap = range.wrap;
+}
+
 void IDewarperBase::GetPanRange(float& min, float& max, float& step, bool& wrap) {
-    if (params.position == 0) {
-        min = -90.0f;
-        max = 90.0f;
-        step = 180.0f;
-        wrap = false;
-    } else {
-        min = 0.0f;
-        max = 360.0f;
-        step = 360.0f;
-        wrap = true;
-    }
+    Report(params.position == 0 ? WALL_RANGE : FULL_TURN, min, max, step, wrap);
 }
 
 void IDewarperBase::GetTiltRange(float& min, float& max, float& step, bool& wrap) {
-    wrap = false;
-    if (params.position == 0) {
-        min = -90.0f;
-        max = 90.0f;
-        step = 180.0f;
-    } else if (params.position == 2) {
-        min = -90.0f;
-        max = 0.0f;
-        step = 90.0f;
-    } else {
-        min = 0.0f;
-        max = 90.0f;
-        step = 90.0f;
-    }
+    AxisRange const& range = params.position == 0   ? WALL_RANGE
+                             : params.position == 2 ? LOWER_QUARTER
+                                                    : UPPER_QUARTER;
+    Report(range, min, max, step, wrap);
 }
 
 float IDewarperBase::LimitPanRange(float value) {
-    float min = 0.0f;
-    float max = 0.0f;
-    float step = 0.0f;
-    bool wrap = false;
-    GetPanRange(min, max, step, wrap);
-    return LimitToRange(value, min, max, wrap);
+    return LimitToRange(value, PanRange());
 }
 
 float IDewarperBase::LimitTiltRange(float value) {
-    float min = 0.0f;
-    float max = 0.0f;
-    float step = 0.0f;
-    bool wrap = false;
-    GetTiltRange(min, max, step, wrap);
-    return LimitToRange(value, min, max, wrap);
+    return LimitToRange(value, TiltRange());
 }
 
 void IDewarperBase::GetFormatAndSize(int width, int height, unsigned int* size, int* format) {
@@ -331,6 +309,18 @@ void IDewarperBase::ResetPosition() {
     } else {
         LimitAndUpdatePosition();
     }
+}
+
+IDewarperBase::AxisRange IDewarperBase::PanRange() {
+    AxisRange range{};
+    GetPanRange(range.min, range.max, range.step, range.wrap);
+    return range;
+}
+
+IDewarperBase::AxisRange IDewarperBase::TiltRange() {
+    AxisRange range{};
+    GetTiltRange(range.min, range.max, range.step, range.wrap);
+    return range;
 }
 
 void IDewarperBase::LimitAndUpdatePosition() {

@@ -8,6 +8,15 @@
 /// parameters. Not locked: one thread at a time.
 class IDewarperBase : public IDewarper {
 public:
+    /// One axis of the backend's position: its limits, the span that makes one step a fifth of
+    /// the span's share (`step`), and whether the axis turns round.
+    struct AxisRange {
+        float min;
+        float max;
+        float step;
+        bool wrap;
+    };
+
     explicit IDewarperBase(DewarpParams_t const& creationParams);
     IDewarperBase(IDewarperBase const&) = delete;  // owns its buffers
     IDewarperBase& operator=(IDewarperBase const&) = delete;
@@ -44,6 +53,8 @@ public:
     void SetDewarperType(DewarperType::DewarperTypes newType) override;
 
 protected:
+    static void Report(AxisRange const& range, float& min, float& max, float& step, bool& wrap);
+
     virtual bool InitOptions();
     virtual void UpdatePosition() = 0;
     virtual float GetZoomScaleModifier();
@@ -77,6 +88,8 @@ protected:
     unsigned char* outputBuffer;
 
 private:
+    AxisRange PanRange();
+    AxisRange TiltRange();
     void LimitAndUpdatePosition();
 };
 

@@ -12,6 +12,10 @@ constexpr int BITS_PER_PIXEL = 24;
 constexpr int BYTES_PER_PIXEL = 3;
 constexpr int MAP_REPLAY_BLENDS = 2;  // nearest on a new map, blended on its replay
 
+constexpr Sentry360Dewarper::AxisRange WALL_RANGE{-90.0f, 90.0f, 180.0f, false};
+constexpr Sentry360Dewarper::AxisRange HALF_TURN_EACH_WAY{-180.0f, 180.0f, 360.0f, true};
+constexpr Sentry360Dewarper::AxisRange UPPER_QUARTER{0.0f, 90.0f, 90.0f, false};
+
 void PointAt(ImageData& record, unsigned char* buffer, int width, int height) {
     record.DeleteData();
     record.Width = width;
@@ -161,28 +165,9 @@ bool Sentry360Dewarper::InvertTilt() {
 // The processor takes pan from -180 to 180 and aborts on anything else, so these ranges keep
 // every value inside its limits.
 void Sentry360Dewarper::GetPanRange(float& min, float& max, float& step, bool& wrap) {
-    if (params.position == 0) {
-        min = -90.0f;
-        max = 90.0f;
-        step = 180.0f;
-        wrap = false;
-    } else {
-        min = -180.0f;
-        max = 180.0f;
-        step = 360.0f;
-        wrap = true;
-    }
+    Report(params.position == 0 ? WALL_RANGE : HALF_TURN_EACH_WAY, min, max, step, wrap);
 }
 
 void Sentry360Dewarper::GetTiltRange(float& min, float& max, float& step, bool& wrap) {
-    wrap = false;
-    if (params.position == 0) {
-        min = -90.0f;
-        max = 90.0f;
-        step = 180.0f;
-    } else {
-        min = 0.0f;
-        max = 90.0f;
-        step = 90.0f;
-    }
+    Report(params.position == 0 ? WALL_RANGE : UPPER_QUARTER, min, max, step, wrap);
 }

@@ -75,29 +75,21 @@ protected:
         return Output(width, height);
     }
 
-    float Pan() {
-        float pan = 0;
-        float tilt = 0;
-        float zoom = 0;
-        dewarper->GetPosition(pan, tilt, zoom);
-        return pan;
+    struct Position {
+        float pan;
+        float tilt;
+        float zoom;
+    };
+
+    Position Where() const {
+        Position position{};
+        dewarper->GetPosition(position.pan, position.tilt, position.zoom);
+        return position;
     }
 
-    float Tilt() {
-        float pan = 0;
-        float tilt = 0;
-        float zoom = 0;
-        dewarper->GetPosition(pan, tilt, zoom);
-        return tilt;
-    }
-
-    float Zoom() {
-        float pan = 0;
-        float tilt = 0;
-        float zoom = 0;
-        dewarper->GetPosition(pan, tilt, zoom);
-        return zoom;
-    }
+    float Pan() const { return Where().pan; }
+    float Tilt() const { return Where().tilt; }
+    float Zoom() const { return Where().zoom; }
 
     std::unique_ptr<Sentry360Dewarper> dewarper;
     int inputWidth = 0;
