@@ -9,7 +9,7 @@
 namespace DewarperType {
 /// The kinds of dewarper, called modes by the host. Every value can come out of
 /// `GetModeByCamera`; only some are registered.
-enum DewarperTypes {
+enum DewarperTypes : int {
     DewarperNone = 0,
     DewarperImmervision = 1,
     DewarperSentry360 = 2,

@@ -3,6 +3,7 @@
 #include <cstring>
 #include <new>
 
+#include "CameraTable.h"
 #include "Sentry360Dewarper.h"
 
 DewarperRegistry DewarperRegistryInstance;
@@ -142,9 +143,8 @@ int DewarperRegistry::GetModeByName(char const* name) {
     return DewarperType::DewarperNone;
 }
 
-// The camera table joins with the camera-selection code; until then no camera has a dewarper.
-int DewarperRegistry::GetModeByCamera(char const*, char const*, char const*) {
-    return DewarperType::DewarperNone;
+int DewarperRegistry::GetModeByCamera(char const* make, char const* model, char const* url) {
+    return CameraTable::ModeOf(make, model, url);
 }
 
 int DewarperRegistry::GetDefaultLens(int mode, char const* make, char const* model) {

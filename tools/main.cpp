@@ -35,6 +35,10 @@ struct Options {
     std::string input;
     std::optional<int> mode;
     std::string kind;
+    // A camera as a client knows it; given at all, it picks the kind through the registry.
+    std::optional<std::string> make;
+    std::optional<std::string> model;
+    std::optional<std::string> url;
     std::optional<int> sub_mode;
     int position = 1;
     std::optional<Circle> circle;
@@ -94,25 +98,56 @@ std::string OutputPath(Options const& options, std::string const& kind, int sub_
         .string();
 }
 
-int ChooseMode(PluginHost const& host, Options const& options) {
-    DewarpRegister& registry = host.Register();
+bool HasCamera(Options const& options) {
+    return options.make || options.model || options.url;
+}
+
+// "make / model", then " / url" when there is one; an empty make or model shows as "".
+std::string CameraText(Options const& options) {
+    auto const shown = [](std::optional<std::string> const& text) {
+        return text.value_or("").empty() ? std::string("\"\"") : *text;
+    };
+    std::string text = shown(options.make) + " / " + shown(options.model);
+    if (!options.url.value_or("").empty()) {
+        text += " / " + *options.url;
+    }
+    return text;
+}
+
+struct Choice {
     int mode = 0;
+    std::string how;  // completes "chosen ..." in the line that names the kind
+};
+
+Choice ChooseMode(PluginHost const& host, Options const& options) {
+    DewarpRegister& registry = host.Register();
+    Choice choice;
     if (options.mode) {
-        mode = *options.mode;
+        choice = {*options.mode, "by mode"};
+    } else if (HasCamera(options)) {
+        choice.mode = registry.GetModeByCamera(options.make.value_or("").c_str(),
+                                               options.model.value_or("").c_str(),
+                                               options.url.value_or("").c_str());
+        if (choice.mode == 0) {
+            throw ToolError("no dewarper kind suits the camera " + CameraText(options));
+        }
+        choice.how = "by camera " + CameraText(options);
     } else {
         std::string const kind = options.kind.empty() ? "Sentry360" : options.kind;
-        mode = registry.GetModeByName(kind.c_str());
-        if (mode == 0) {
+        choice = {registry.GetModeByName(kind.c_str()),
+                  options.kind.empty() ? "by default" : "by name"};
+        if (choice.mode == 0) {
             throw ToolError("unknown dewarper kind \"" + kind + "\"");
         }
     }
-    if (std::string(registry.GetName(mode)).empty()) {
-        throw ToolError("no dewarper kind has mode " + std::to_string(mode));
+    if (std::string(registry.GetName(choice.mode)).empty()) {
+        throw ToolError("no dewarper kind has mode " + std::to_string(choice.mode));
     }
-    if (!host.DewarperLoaded(mode)) {
-        throw ToolError(std::string("the ") + registry.GetName(mode) + " dewarper is not loaded");
+    if (!host.DewarperLoaded(choice.mode)) {
+        throw ToolError(std::string("the ") + registry.GetName(choice.mode) +
+                        " dewarper is not loaded");
     }
-    return mode;
+    return choice;
 }
 
 void RequireCircleInside(Circle const& circle, RgbImage const& picture) {
@@ -142,7 +177,8 @@ int Run(Options const& options) {
     circle = options.circle.value_or(circle);
     RequireCircleInside(circle, picture);
 
-    int const mode = ChooseMode(host, options);
+    Choice const choice = ChooseMode(host, options);
+    int const mode = choice.mode;
     DewarpRegister& registry = host.Register();
     std::string const kind = registry.GetName(mode);
     bool has_lenses = false;
@@ -171,6 +207,8 @@ int Run(Options const& options) {
         throw ToolError("the " + kind + " dewarper has no sub-mode " +
                         std::to_string(*options.sub_mode));
     }
+    // Printed once only rendering and writing can fail, so that a refusal leaves stdout empty.
+    printf("%s dewarper (mode %d), chosen %s\n", kind.c_str(), mode, choice.how.c_str());
     for (int const sub_mode : sub_modes) {
         RgbImage const view = session.Render(sub_mode, options.ptz, picture, options.width,
                                              options.height, options.frames);
@@ -186,8 +224,20 @@ void AddOptions(CLI::App& app, Options& options) {
     app.add_option("--input", options.input,
                    "PNG or JPEG fisheye picture (default: built-in sample)");
     auto* mode = app.add_option("--mode", options.mode, "dewarper mode number");
-    app.add_option("--kind", options.kind, "dewarper kind by display name (default: Sentry360)")
-        ->excludes(mode);
+    auto* kind =
+        app.add_option("--kind", options.kind, "dewarper kind by display name (default: Sentry360)")
+            ->excludes(mode);
+    app.add_option("--make", options.make,
+                   "camera make as the device reports it; the camera picks the kind as a client "
+                   "would")
+        ->excludes(mode)
+        ->excludes(kind);
+    app.add_option("--model", options.model, "camera model as the device reports it")
+        ->excludes(mode)
+        ->excludes(kind);
+    app.add_option("--url", options.url, "stream URL of the camera")
+        ->excludes(mode)
+        ->excludes(kind);
     app.add_option("--submode", options.sub_mode,
                    "view kind: 1 PTZ, 2 panorama, 3 dual panorama (default: every supported one)")
         ->check(CLI::Range(1, 3));

@@ -87,9 +87,11 @@ TEST(DewarperRegistry, GetLensOfAKindWithoutLensesGivesZeroAndWritesNothing) {
     EXPECT_STREQ("intact", buffer);
 }
 
-TEST(DewarperRegistry, NoCameraHasADewarperBeforeTheCameraTableIsKnown) {
+TEST(DewarperRegistry, GetModeByCameraAnswersFromTheCameraTable) {
     DewarperRegistry registry;
-    EXPECT_EQ(0, registry.GetModeByCamera("Sentry360", "FS-IP5000", ""));
+    EXPECT_EQ(2, registry.GetModeByCamera("Sentry360", "FS-IP5000", ""));
+    EXPECT_EQ(10, registry.GetModeByCamera("AXIS", "M3007-P", ""));
+    EXPECT_EQ(0, registry.GetModeByCamera("Acme", "Fisheye", ""));
     EXPECT_EQ(0, registry.GetModeByCamera(nullptr, nullptr, nullptr));
 }
 

@@ -81,6 +81,7 @@ TEST_F(BinaryContractTest, RegistrySlotsAnswerInTheirOrder) {
     EXPECT_EQ(17, registry->GetModeCount());
     EXPECT_EQ(SENTRY360, registry->GetModeByName("Sentry360"));
     EXPECT_EQ(0, registry->GetModeByCamera("", "", ""));
+    EXPECT_EQ(SENTRY360, registry->GetModeByCamera("RTSP", "", "rtsp://camera/h264"));
     EXPECT_EQ(0, registry->GetDefaultLens(SENTRY360, "", ""));
     CameraRecord const record{};
     Dewarper* dewarper = registry->Create(SENTRY360, record);

@@ -141,7 +141,8 @@ TEST_F(VexmapTest, PrintsOneLinePerFileWritten) {
     std::string const output = PathOf("views");
     Outcome const outcome = Run({"--output", output});
     ASSERT_EQ(0, outcome.status) << outcome.err;
-    EXPECT_EQ(2, std::count(outcome.out.begin(), outcome.out.end(), '\n')) << outcome.out;
+    EXPECT_THAT(outcome.out, StartsWith("Sentry360 dewarper (mode 2), chosen by default\n"));
+    EXPECT_EQ(3, std::count(outcome.out.begin(), outcome.out.end(), '\n')) << outcome.out;
     EXPECT_THAT(outcome.out, HasSubstr(output + "/sentry360-ptz.png\n"));
     EXPECT_THAT(outcome.out, HasSubstr(output + "/sentry360-panorama.png\n"));
 }
@@ -202,6 +203,73 @@ TEST_F(VexmapTest, ModeTwoChoosesSentry360) {
         Run({"--input", input, "--mode", "2", "--submode", "2", "--output", output});
     ASSERT_EQ(0, outcome.status) << outcome.err;
     EXPECT_EQ(128, ReadImage(output + "/sentry360-panorama.png").width);
+}
+
+TEST_F(VexmapTest, SaysWhetherTheKindWasChosenByNameOrByMode) {
+    Outcome const by_name = Run({"--kind", "Sentry360", "--output", PathOf("by-name")});
+    ASSERT_EQ(0, by_name.status) << by_name.err;
+    EXPECT_THAT(by_name.out, StartsWith("Sentry360 dewarper (mode 2), chosen by name\n"));
+    Outcome const by_mode = Run({"--mode", "2", "--output", PathOf("by-mode")});
+    ASSERT_EQ(0, by_mode.status) << by_mode.err;
+    EXPECT_THAT(by_mode.out, StartsWith("Sentry360 dewarper (mode 2), chosen by mode\n"));
+}
+
+TEST_F(VexmapTest, RtspStreamWhoseUrlEndsInH264ChoosesSentry360) {
+    std::string const output = PathOf("views");
+    Outcome const outcome = Run(
+        {"--make", "RTSP", "--model", "x", "--url", "rtsp://192.168.0.9/h264", "--output", output});
+    ASSERT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_EQ("", outcome.err);
+    EXPECT_THAT(outcome.out, StartsWith("Sentry360 dewarper (mode 2), chosen by camera RTSP / x / "
+                                        "rtsp://192.168.0.9/h264\n"));
+    EXPECT_EQ(960, ReadImage(output + "/sentry360-ptz.png").width);
+    EXPECT_EQ(512, ReadImage(output + "/sentry360-panorama.png").width);
+}
+
+TEST_F(VexmapTest, Sentry360MakeWithAnFsModelChoosesSentry360) {
+    std::string const output = PathOf("views");
+    Outcome const outcome =
+        Run({"--make", "Sentry360", "--model", "FS-IP5000", "--output", output});
+    ASSERT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_THAT(outcome.out, StartsWith("Sentry360 dewarper (mode 2), chosen by camera Sentry360 / "
+                                        "FS-IP5000\n"));
+    EXPECT_EQ(960, ReadImage(output + "/sentry360-ptz.png").width);
+}
+
+TEST_F(VexmapTest, CameraThatNoKindSuitsIsARuntimeFailure) {
+    Outcome const outcome =
+        Run({"--make", "Acme", "--model", "Fisheye 360", "--output", PathOf("views")});
+    ExpectOneLineFailure(outcome, "no dewarper kind suits the camera Acme / Fisheye 360");
+    EXPECT_EQ(RUNTIME_FAILURE, outcome.status);
+    EXPECT_FALSE(std::filesystem::exists(directory / "views"));
+}
+
+TEST_F(VexmapTest, ModelAloneIsACameraWithAnEmptyMake) {
+    Outcome const outcome = Run({"--model", "FS-IP5000", "--output", PathOf("views")});
+    ExpectOneLineFailure(outcome, "no dewarper kind suits the camera \"\" / FS-IP5000");
+    EXPECT_EQ(RUNTIME_FAILURE, outcome.status);
+}
+
+TEST_F(VexmapTest, CameraOfAKindThatIsNotRegisteredIsARuntimeFailure) {
+    Outcome const outcome =
+        Run({"--make", "AXIS", "--model", "M3007", "--output", PathOf("views")});
+    ExpectOneLineFailure(outcome, "no dewarper kind has mode 10");
+    EXPECT_EQ(RUNTIME_FAILURE, outcome.status);
+    EXPECT_FALSE(std::filesystem::exists(directory / "views"));
+}
+
+TEST_F(VexmapTest, MakeAndModeTogetherAreAUsageError) {
+    Outcome const outcome =
+        Run({"--make", "Sentry360", "--mode", "2", "--output", PathOf("views")});
+    ExpectOneLineFailure(outcome, "--make");
+    EXPECT_EQ(USAGE_ERROR, outcome.status);
+    EXPECT_FALSE(std::filesystem::exists(directory / "views"));
+}
+
+TEST_F(VexmapTest, UrlAndKindTogetherAreAUsageError) {
+    Outcome const outcome = Run({"--url", "rtsp://192.168.0.9/h264", "--kind", "Sentry360"});
+    ExpectOneLineFailure(outcome, "--url");
+    EXPECT_EQ(USAGE_ERROR, outcome.status);
 }
 
 TEST_F(VexmapTest, HelpExitsCleanly) {
