@@ -10,16 +10,6 @@ Vector2d const Vector2d::InfiniteVector(FloatingPoint::Infinity, FloatingPoint::
 Vector2d const Vector2d::ZeroVector(0.0f, 0.0f);
 Vector2d const Vector2d::IdentityVector(1.0f, 1.0f);
 
-Vector2d::Vector2d() : x(0.0f), y(0.0f) {}
-
-Vector2d::Vector2d(Vector2d const& other) = default;
-
-Vector2d::Vector2d(float x_value, float y_value) : x(x_value), y(y_value) {}
-
-Vector2d& Vector2d::operator=(Vector2d const& other) = default;
-
-Vector2d::~Vector2d() = default;
-
 bool Vector2d::operator==(Vector2d const& other) const {
     return !(*this != other);
 }
@@ -28,20 +18,8 @@ bool Vector2d::operator!=(Vector2d const& other) const {
     return FloatingPoint::is_lessgreater(x, other.x) || FloatingPoint::is_lessgreater(y, other.y);
 }
 
-Vector2d Vector2d::operator+(Vector2d const& other) const {
-    return Vector2d(x + other.x, y + other.y);
-}
-
-Vector2d Vector2d::operator-(Vector2d const& other) const {
-    return Vector2d(x - other.x, y - other.y);
-}
-
 Vector2d Vector2d::operator-() const {
     return Vector2d(-x, -y);
-}
-
-Vector2d Vector2d::operator*(float factor) const {
-    return Vector2d(x * factor, y * factor);
 }
 
 Vector2d Vector2d::operator/(float divisor) const {

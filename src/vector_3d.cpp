@@ -8,13 +8,6 @@ namespace quorvel::vexmap {
 Vector3d const Vector3d::ZeroVector(0.0f, 0.0f, 0.0f);
 Vector3d const Vector3d::InvalidVector(FloatingPoint::Nan, FloatingPoint::Nan, FloatingPoint::Nan);
 
-Vector3d::Vector3d() : x(0.0f), y(0.0f), z(0.0f) {}
-
-Vector3d::Vector3d(Vector3d const& other) = default;
-
-Vector3d::Vector3d(float x_value, float y_value, float z_value)
-    : x(x_value), y(y_value), z(z_value) {}
-
 Vector3d& Vector3d::operator=(Vector3d const& other) {
     if (this == &other) {
         Log::warn(__LINE__, __FILE__, "operator=", "Self assignment of %s object\n", "Vector3d");
@@ -25,8 +18,6 @@ Vector3d& Vector3d::operator=(Vector3d const& other) {
     z = other.z;
     return *this;
 }
-
-Vector3d::~Vector3d() = default;
 
 // Plain equality here and the lenient test in != are both intended: a NaN pair is neither.
 bool Vector3d::operator==(Vector3d const& other) const {

@@ -12,18 +12,19 @@ public:
     static Vector2d const ZeroVector;
     static Vector2d const IdentityVector;  // (1, 1)
 
-    Vector2d();  // (0, 0)
-    Vector2d(Vector2d const& other);
-    Vector2d(float x_value, float y_value);
-    Vector2d& operator=(Vector2d const& other);
-    virtual ~Vector2d();
+    // Inline: vectors are made and copied in every step of a map build.
+    Vector2d() : x(0.0f), y(0.0f) {}  // (0, 0)
+    Vector2d(Vector2d const& other) = default;
+    Vector2d(float x_value, float y_value) : x(x_value), y(y_value) {}
+    Vector2d& operator=(Vector2d const& other) = default;
+    virtual ~Vector2d() = default;
 
     bool operator==(Vector2d const& other) const;  // no component differs
     bool operator!=(Vector2d const& other) const;  // some component differs
-    Vector2d operator+(Vector2d const& other) const;
-    Vector2d operator-(Vector2d const& other) const;
+    Vector2d operator+(Vector2d const& other) const { return Vector2d(x + other.x, y + other.y); }
+    Vector2d operator-(Vector2d const& other) const { return Vector2d(x - other.x, y - other.y); }
     Vector2d operator-() const;
-    Vector2d operator*(float factor) const;
+    Vector2d operator*(float factor) const { return Vector2d(x * factor, y * factor); }
     Vector2d operator/(float divisor) const;
 
     void SetZero();

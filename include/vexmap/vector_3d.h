@@ -10,11 +10,12 @@ public:
     static Vector3d const ZeroVector;
     static Vector3d const InvalidVector;  // three NaN
 
-    Vector3d();  // (0, 0, 0)
-    Vector3d(Vector3d const& other);
-    Vector3d(float x_value, float y_value, float z_value);
+    // Inline: vectors are made and copied in every step of a map build.
+    Vector3d() : x(0.0f), y(0.0f), z(0.0f) {}  // (0, 0, 0)
+    Vector3d(Vector3d const& other) = default;
+    Vector3d(float x_value, float y_value, float z_value) : x(x_value), y(y_value), z(z_value) {}
     Vector3d& operator=(Vector3d const& other);
-    virtual ~Vector3d();
+    virtual ~Vector3d() = default;
 
     bool operator==(Vector3d const& other) const;
     bool operator!=(Vector3d const& other) const;

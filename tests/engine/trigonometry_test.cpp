@@ -1,8 +1,10 @@
 #include "vexmap/trigonometry.h"
 
+#include <cmath>
 #include <cstdint>
 #include <cstring>
 #include <limits>
+#include <random>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -155,6 +157,29 @@ TEST(Trigonometry, AssignmentToItselfWarns) {
     auto const lines = sink.Lines();
     ASSERT_EQ(1u, lines.size());
     EXPECT_EQ("VEXMAP: WARNING - Self assignment of Trigonometry object\n", lines[0].text);
+}
+
+TEST(Trigonometry, FloatHypotIsTheLibrarysBitForBit) {
+    std::mt19937 random(7);
+    for (int i = 0; i < 1000000; ++i) {
+        uint32_t const a = uint32_t(random());
+        uint32_t const b = uint32_t(random());
+        float x = 0.0f;
+        float y = 0.0f;
+        std::memcpy(&x, &a, sizeof x);
+        std::memcpy(&y, &b, sizeof y);
+        if (i % 2 == 1) {  // map-sized values as well as every exponent
+            x = float(a % 200000u) / 64.0f - 1500.0f;
+            y = float(b % 200000u) / 64.0f - 1500.0f;
+        }
+        ASSERT_EQ(Bits(std::hypot(x, y)), Bits(Trigonometry::hypot(x, y))) << x << " " << y;
+    }
+}
+
+TEST(Trigonometry, FloatHypotOfInfinityIsInfiniteEvenBesideNotANumber) {
+    float const infinity = std::numeric_limits<float>::infinity();
+    EXPECT_EQ(infinity, Trigonometry::hypot(-infinity, NAN_VALUE));
+    EXPECT_TRUE(std::isnan(Trigonometry::hypot(NAN_VALUE, 1.0f)));
 }
 
 }  // namespace
