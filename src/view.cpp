@@ -1,0 +1,408 @@
+#include "vexmap/view.h"
+
+#include <cerrno>
+#include <cstdint>
+
+#include "vexmap/code_location.h"
+#include "vexmap/error.h"
+#include "vexmap/floating_point.h"
+#include "vexmap/log.h"
+#include "vexmap/map_functors.h"
+#include "vexmap/performance_timer.h"
+#include "vexmap/projection.h"
+#include "vexmap/projection_functor.h"
+#include "vexmap/rectangle_2d.h"
+#include "vexmap/spherical_orientation_functor.h"
+
+namespace quorvel::vexmap {
+
+namespace {
+
+// Below 2^22 in magnitude, adding and taking away 1.5 * 2^23 rounds a float to the nearest
+// integer, ties to even, exactly as nearbyint does in the default rounding mode, with no call.
+constexpr float NEAR_LIMIT = 4194304.0f;
+constexpr float ROUNDER = 12582912.0f;
+
+// Both tests always run, so that a run of them needs no branch.
+bool IsNear(float coordinate) {
+    return (coordinate > -NEAR_LIMIT) & (coordinate < NEAR_LIMIT);
+}
+
+unsigned short NearMapWord(float coordinate) {
+    int32_t const whole = int32_t((coordinate + ROUNDER) - ROUNDER);
+    int32_t const clamped = whole > int32_t(SimpleImageMap::MAX_MAP_VALUE)
+                                ? int32_t(SimpleImageMap::MAX_MAP_VALUE)
+                                : whole;
+    return static_cast<unsigned short>(uint32_t(clamped) & 0xFFFFu);
+}
+
+// Far outside any picture, or not a number: rare, so kept out of the builders' loops.
+[[gnu::noinline]] unsigned short OutlyingMapWord(float coordinate) {
+    float const rounded = FloatingPoint::nearbyint(coordinate);
+    if (rounded > float(SimpleImageMap::MAX_MAP_VALUE)) {
+        return SimpleImageMap::MAX_MAP_VALUE;
+    }
+    if (!(rounded >= -2147483648.0f)) {
+        return 0;
+    }
+    return static_cast<unsigned short>(uint32_t(int32_t(rounded)) & 0xFFFFu);
+}
+
+// A point of a span in plain floats, kept in registers while a span is halved.
+struct SpanPoint {
+    float x;
+    float y;
+};
+
+SpanPoint Half(SpanPoint const& a, SpanPoint const& b) {
+    return SpanPoint{(a.x + b.x) * 0.5f, (a.y + b.y) * 0.5f};
+}
+
+// The words of a run of coordinates, in the table's order: x, y, x, y. When every coordinate is
+// near, which is the rule, the loop is plain enough to run several words at a time.
+template <int COUNT>
+void StoreWords(unsigned short*& cursor, float const (&coordinates)[COUNT]) {
+    bool all_near = true;
+    for (float const coordinate : coordinates) {
+        all_near &= IsNear(coordinate);
+    }
+    if (all_near) {
+        for (int i = 0; i < COUNT; ++i) {
+            cursor[i] = NearMapWord(coordinates[i]);
+        }
+    } else {
+        for (int i = 0; i < COUNT; ++i) {
+            cursor[i] = View::MapWord(coordinates[i]);
+        }
+    }
+    cursor += COUNT;
+}
+
+}  // namespace
+
+View::View() = default;
+
+View::View(View const& other) = default;
+
+View::View(boost::shared_ptr<ViewTraits const> const& traits_value) : AbstractView(traits_value) {}
+
+View::View(boost::shared_ptr<ViewTraits const> const& traits_value,
+           boost::shared_ptr<Camera> const& camera_value)
+    : AbstractView(traits_value, camera_value) {}
+
+View::View(boost::shared_ptr<ViewTraits const> const& traits_value,
+           boost::shared_ptr<Camera> const& camera_value, _DEWARP_PROJECTION projection_value)
+    : AbstractView(traits_value, camera_value, projection_value) {}
+
+View::View(boost::shared_ptr<ViewTraits const> const& traits_value,
+           boost::shared_ptr<Camera> const& camera_value, _DEWARP_PROJECTION projection_value,
+           _DEWARP_ASPECT_RATIO aspect_ratio_value)
+    : AbstractView(traits_value, camera_value, projection_value, aspect_ratio_value) {}
+
+View::View(boost::shared_ptr<ViewTraits const> const& traits_value,
+           boost::shared_ptr<Camera> const& camera_value, _DEWARP_PROJECTION projection_value,
+           Resolution const& resolution)
+    : AbstractView(traits_value, camera_value, projection_value, resolution) {}
+
+View::View(boost::shared_ptr<ViewTraits const> const& traits_value,
+           boost::shared_ptr<Camera> const& camera_value, _DEWARP_PROJECTION projection_value,
+           Resolution const& resolution, _DEWARP_ASPECT_RATIO aspect_ratio_value)
+    : AbstractView(traits_value, camera_value, projection_value, resolution, aspect_ratio_value) {}
+
+View::View(boost::shared_ptr<Camera> const& camera_value) : AbstractView(camera_value) {}
+
+View::View(boost::shared_ptr<Camera> const& camera_value, _DEWARP_PROJECTION projection_value)
+    : AbstractView(camera_value, projection_value) {}
+
+View::View(boost::shared_ptr<Camera> const& camera_value, _DEWARP_PROJECTION projection_value,
+           _DEWARP_ASPECT_RATIO aspect_ratio_value)
+    : AbstractView(camera_value, projection_value, aspect_ratio_value) {}
+
+View::View(boost::shared_ptr<Camera> const& camera_value, _DEWARP_PROJECTION projection_value,
+           Resolution const& resolution)
+    : AbstractView(camera_value, projection_value, resolution) {}
+
+View::View(boost::shared_ptr<Camera> const& camera_value, _DEWARP_PROJECTION projection_value,
+           Resolution const& resolution, _DEWARP_ASPECT_RATIO aspect_ratio_value)
+    : AbstractView(camera_value, projection_value, resolution, aspect_ratio_value) {}
+
+View& View::operator=(View const& other) {
+    if (this == &other) {
+        Log::warn(__LINE__, __FILE__, "operator=", "Self assignment of %s object\n", "View");
+        return *this;
+    }
+    AbstractView::operator=(other);
+    image_map = other.image_map;
+    return *this;
+}
+
+View::~View() = default;
+
+void View::OnAspectRatioChange(_DEWARP_ASPECT_RATIO old_ratio, _DEWARP_ASPECT_RATIO new_ratio) {
+    AbstractView::OnAspectRatioChange(old_ratio, new_ratio);
+    image_map.reset();
+}
+
+void View::OnSizeChange(Resolution const& old_size, Resolution const& new_size) {
+    AbstractView::OnSizeChange(old_size, new_size);
+    image_map.reset();
+}
+
+void View::OnOutputChange(Resolution const& old_size, _DEWARP_ASPECT_RATIO old_ratio,
+                          Resolution const& new_size, _DEWARP_ASPECT_RATIO new_ratio) {
+    AbstractView::OnOutputChange(old_size, old_ratio, new_size, new_ratio);
+    image_map.reset();
+}
+
+void View::OnZoomChange(PtzPosition const& old_ptz, PtzPosition const& new_ptz) {
+    AbstractView::OnZoomChange(old_ptz, new_ptz);
+    image_map.reset();
+}
+
+void View::OnOrientationChange(PtzPosition const& old_ptz, PtzPosition const& new_ptz) {
+    AbstractView::OnOrientationChange(old_ptz, new_ptz);
+    image_map.reset();
+}
+
+void View::OnPtzChange(PtzPosition const& old_ptz, PtzPosition const& new_ptz) {
+    AbstractView::OnPtzChange(old_ptz, new_ptz);
+    image_map.reset();
+}
+
+// The map is used through the view's own pointer, not a copy: the channel's write lock is what
+// keeps a change from dropping it under a running remap.
+void View::DewarpImage(_DEWARP_IMAGE const& warped, _DEWARP_IMAGE& dewarped) {
+    PerformanceTimer timer("image dewarp");
+    timer.Start();
+    CheckMap(Resolution(uint32_t(dewarped.info.width), uint32_t(dewarped.info.height)));
+    if (!image_map) {
+        Error::SetLastError(EINVAL);
+        throw Error(CodeLocation("src/view", "View", "DewarpImage", __LINE__), EINVAL,
+                    "Invalid image map");
+    }
+    image_map->Remap(warped, dewarped);
+    timer.Finish();
+}
+
+void View::CheckMap(Resolution const& size) {
+    SetDewarpedSize(size);
+    if (!image_map) {
+        BuildMap();
+    }
+}
+
+Transform2dFunctor::_TRANSFORM_2D View::GetScaleTransform(Resolution const& output) const {
+    Transform2dFunctor::_TRANSFORM_2D transform = {};
+    float const z = ptz.zoom;
+    Resolution const& p = projection_size;
+    float const fit = p.BestScale(output.BestFit(p.AspectRatio()));
+    float const fill = p.BestScale(output);
+    float uniform = 0.0f;
+    switch (aspect_ratio) {
+        case DEWARP_ASPECT_RATIO_FIT:
+            uniform = fit;
+            break;
+        case DEWARP_ASPECT_RATIO_FILL:
+            uniform = fill;
+            break;
+        case DEWARP_ASPECT_RATIO_FIT_WIDTH:
+            uniform = FloatingPoint::is_less(output.AspectRatio(), p.AspectRatio()) ? fit : fill;
+            break;
+        default:  // stretch: each axis by itself
+            transform.scale_x = 1.0f / (p.x / output.x / z);
+            transform.scale_y = 1.0f / (p.y / output.y / z);
+            return transform;
+    }
+    transform.scale_x = 1.0f / (uniform / z);
+    transform.scale_y = transform.scale_x;
+    return transform;
+}
+
+// A picture looking up or down shows half the sphere's height, so it is stretched twice and
+// moved half the crop towards the horizon, scaled with the zoom.
+MapFunctor* View::GetScaleFunctor(Vector2d const& crop) const {
+    Transform2dFunctor::_TRANSFORM_2D transform = GetScaleTransform(dewarped_size);
+    float const z = ptz.zoom;
+    switch (GetCamera().GetMount()) {
+        case DEWARP_INTERNAL_CAMERA_MOUNT_FLOOR:
+            transform.offset_y = crop.y * 0.5f * z;
+            transform.scale_y = transform.scale_y * 2.0f;
+            break;
+        case DEWARP_INTERNAL_CAMERA_MOUNT_CEILING:
+            transform.offset_y = crop.y * -0.5f * z;
+            transform.scale_y = transform.scale_y * 2.0f;
+            break;
+        default:
+            break;
+    }
+    return new Transform2dFunctor(transform);
+}
+
+MapFunctor* View::GetProjectionFunctor() {
+    Camera const& lens = GetCamera();
+    return new ProjectionFunctor(projection, lens.GetType(), lens.GetFocalLength(),
+                                 Projection::IdentityScale);
+}
+
+MapFunctor* View::GetPtzFunctor() {
+    Camera const& lens = GetCamera();
+    PtzPosition home = lens.GetHomePosition();
+    home.Concatenate(ptz);
+    return new SphericalOrientationFunctor(home, lens.GetFocalLength());
+}
+
+void View::BuildMap() {
+    BuildEighthMap();
+}
+
+void View::BuildWholeMap() {
+    BuildStepMap(1);
+}
+
+void View::BuildHalfMap() {
+    BuildStepMap(2);
+}
+
+void View::BuildQuarterMap() {
+    BuildStepMap(4);
+}
+
+void View::BuildEighthMap() {
+    BuildStepMap(8);
+}
+
+// Only whole spans are stored: the loop stops while the span's end is below the right edge, so
+// the last step - 1 columns of a row whose width is a multiple of the step stay unmapped. That is
+// accepted; the bound is not to be widened nor the tail extrapolated.
+void View::BuildStepMap(int step) {
+    Vector2d const crop = GetCropSize();
+    BuildShiftedMap(crop, crop, step, [](int, int, int) { return Vector2d(); });
+}
+
+void View::BuildShiftedMap(Vector2d const& scale_crop, Vector2d const& area_size, int step,
+                           RowShift shift) {
+    PerformanceTimer timer("One stage map build");
+    timer.Start();
+    MapFunctors chain;
+    chain.PushBack(GetScaleFunctor(scale_crop));
+    chain.PushBack(GetProjectionFunctor());
+    chain.PushBack(GetPtzFunctor());
+    MapWalk const walk = StartMapWalk(area_size);
+    int const column = static_cast<int>(float(walk.left) + walk.origin.x);
+    for (int y = walk.bottom; y < walk.top && HasEntries(*walk.map); ++y) {
+        Vector2d const row_shift = shift(y, walk.left, walk.bottom);
+        float const y_in = float(y) + row_shift.y;
+        unsigned short* cursor =
+            EntryAt(*walk.map, column, static_cast<int>(float(y) + walk.origin.y));
+        Vector2d p = chain.Call(Vector2d(float(walk.left) + row_shift.x, y_in));
+        StorePoint(cursor, p, walk.centre);
+        for (int x = walk.left + step; x < walk.right; x += step) {
+            Vector2d const q = chain.Call(Vector2d(float(x) + row_shift.x, y_in));
+            StoreSpan(cursor, p, q, walk.centre, step);
+            p = q;
+        }
+    }
+    image_map = walk.map;
+    timer.Finish();
+}
+
+// The area is cut to the output, as a crop cannot exceed it, and centred on the origin, so that
+// bottom is negative and top positive; its edges are truncated toward zero.
+View::MapWalk View::StartMapWalk(Vector2d const& area_size) const {
+    MapWalk walk;
+    walk.map = NewImageMap();
+    walk.map->image_size = GetCamera().GetResolution();
+    walk.centre = GetCamera().GetResolution().Centre();
+    walk.origin = dewarped_size.Centre();
+    Rectangle2d area(area_size);
+    area.Intersection(Rectangle2d(dewarped_size));
+    area.OffsetToCentre();
+    walk.left = static_cast<int>(area.left);
+    walk.right = static_cast<int>(area.right);
+    walk.bottom = static_cast<int>(area.bottom);
+    walk.top = static_cast<int>(area.top);
+    return walk;
+}
+
+// The table's word count is a signed 32-bit product: an output whose count does not fit would
+// leave a table that wrapped to a smaller one, which the builders and the remap would run past.
+boost::shared_ptr<SimpleImageMap> View::NewImageMap() const {
+    float const width = dewarped_size.x;
+    float const height = dewarped_size.y;
+    constexpr float WORD_LIMIT = 2147483648.0f;
+    if (!(width >= 0.0f && height >= 0.0f && width < WORD_LIMIT && height < WORD_LIMIT &&
+          width * height * 2.0f < WORD_LIMIT)) {
+        Log::err(__LINE__, __FILE__, "NewImageMap", "Image map of %f x %f is too large\n",
+                 double(width), double(height));
+        Error::SetLastError(ENOMEM);
+        throw Error(CodeLocation("src/view", "View", "NewImageMap", __LINE__), ENOMEM,
+                    "Invalid image map size");
+    }
+    return boost::shared_ptr<SimpleImageMap>(new SimpleImageMap(dewarped_size));
+}
+
+// An output without columns or rows has a table without entries: nothing may be written.
+bool View::HasEntries(SimpleImageMap const& map) {
+    return map.GetMapWidth() > 0 && map.GetMapHeight() > 0;
+}
+
+unsigned short* View::EntryAt(SimpleImageMap const& map, int column, int row) {
+    uint32_t const index = uint32_t(map.GetMapWidth()) * uint32_t(row) + uint32_t(column);
+    return map.GetMap() + 2 * std::size_t(index);
+}
+
+// Rounded; above the largest word it is that word; else the low 16 bits of the 32-bit integer,
+// so a negative point wraps to a word beyond any picture and reads as outside. A NaN, like a
+// value below the 32-bit range, gives the integer minimum and so the word 0: spelled out here
+// because the conversion itself would be undefined.
+unsigned short View::MapWord(float coordinate) {
+    return IsNear(coordinate) ? NearMapWord(coordinate) : OutlyingMapWord(coordinate);
+}
+
+void View::StorePoint(unsigned short*& cursor, Vector2d const& point, Vector2d const& centre) {
+    cursor[0] = MapWord(point.x + centre.x);
+    cursor[1] = MapWord(point.y + centre.y);
+    cursor += 2;
+}
+
+// The points between p and q by repeated halving, each midpoint from the two points that enclose
+// it, in single precision: for a step of 8, m4 from p and q, m2 and m6 from those, then m1, m3,
+// m5 and m7. The centre is added after the halving, never before. This runs for seven of every
+// eight entries of a map.
+void View::StoreSpan(unsigned short*& cursor, Vector2d const& p, Vector2d const& q,
+                     Vector2d const& centre, int step) {
+    SpanPoint const first{p.x, p.y};
+    SpanPoint const last{q.x, q.y};
+    float const cx = centre.x;
+    float const cy = centre.y;
+    if (step == 1) {
+        float const words[2] = {last.x + cx, last.y + cy};
+        StoreWords(cursor, words);
+    } else if (step == 2) {
+        SpanPoint const m = Half(first, last);
+        float const words[4] = {m.x + cx, m.y + cy, last.x + cx, last.y + cy};
+        StoreWords(cursor, words);
+    } else if (step == 4) {
+        SpanPoint const m2 = Half(first, last);
+        SpanPoint const m1 = Half(first, m2);
+        SpanPoint const m3 = Half(m2, last);
+        float const words[8] = {m1.x + cx, m1.y + cy, m2.x + cx,   m2.y + cy,
+                                m3.x + cx, m3.y + cy, last.x + cx, last.y + cy};
+        StoreWords(cursor, words);
+    } else {
+        SpanPoint const m4 = Half(first, last);
+        SpanPoint const m2 = Half(first, m4);
+        SpanPoint const m6 = Half(m4, last);
+        SpanPoint const m1 = Half(first, m2);
+        SpanPoint const m3 = Half(m2, m4);
+        SpanPoint const m5 = Half(m4, m6);
+        SpanPoint const m7 = Half(m6, last);
+        float const words[16] = {m1.x + cx, m1.y + cy, m2.x + cx,   m2.y + cy,
+                                 m3.x + cx, m3.y + cy, m4.x + cx,   m4.y + cy,
+                                 m5.x + cx, m5.y + cy, m6.x + cx,   m6.y + cy,
+                                 m7.x + cx, m7.y + cy, last.x + cx, last.y + cy};
+        StoreWords(cursor, words);
+    }
+}
+
+}  // namespace quorvel::vexmap
