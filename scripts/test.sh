@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # Installs what is missing, builds, runs every test, then builds again with AddressSanitizer and
-# UndefinedBehaviorSanitizer and runs every test again. Exits non-zero on any failure.
+# UndefinedBehaviorSanitizer and runs every test again; before that last run, the channel thread
+# tests are built and run alone under ThreadSanitizer. Exits non-zero on any failure.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
@@ -12,9 +13,17 @@ cmake -S . -B build -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo >/dev/null
 cmake --build build -j "$jobs"
 ctest --test-dir build -j "$jobs" --output-on-failure
 
-echo "== build and test with address and undefined-behaviour sanitizers"
+echo "== build with address and undefined-behaviour sanitizers"
 cmake -S . -B build-sanitize -G Ninja -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_COMPILER=clang++ \
       -DVEXMAP_SANITIZE=ON -DVEXMAP_BUILD_BENCHMARKS=OFF >/dev/null
 cmake --build build-sanitize -j "$jobs"
+
+echo "== build and test the channel threads with the thread sanitizer"
+cmake -S . -B build-tsan -G Ninja -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_COMPILER=clang++ \
+      -DVEXMAP_THREAD_SANITIZE=ON -DVEXMAP_BUILD_BENCHMARKS=OFF -DVEXMAP_BUILD_TOOLS=OFF >/dev/null
+cmake --build build-tsan -j "$jobs" --target channel_thread_tests
+TSAN_OPTIONS=halt_on_error=1 ctest --test-dir build-tsan -R channel_thread_tests --output-on-failure
+
+echo "== test with address and undefined-behaviour sanitizers"
 ASAN_OPTIONS=detect_leaks=1:abort_on_error=0 UBSAN_OPTIONS=print_stacktrace=1 \
     ctest --test-dir build-sanitize -j "$jobs" --output-on-failure
