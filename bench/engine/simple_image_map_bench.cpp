@@ -1,0 +1,253 @@
+// What a frame costs once its map stands: one walk of the table for each pixel layout, beside a
+// memcpy of as many output bytes and, when OpenCV is present, its nearest-neighbour remap of the
+// same YUV 4:2:0 frame through the same coordinates.
+#include "vexmap/simple_image_map.h"
+
+#include <cstdint>
+#include <cstring>
+#include <ctime>
+#include <vector>
+
+#include <benchmark/benchmark.h>
+#include <boost/shared_ptr.hpp>
+#ifdef VEXMAP_BENCH_WITH_OPENCV
+#include <opencv2/core.hpp>
+#include <opencv2/imgproc.hpp>
+#endif
+
+#include "bench_views.h"
+
+namespace quorvel::vexmap {
+namespace {
+
+constexpr int SOURCE_SIDE = bench::SOURCE_SIZE;
+constexpr int OUTPUT_WIDTH = 1920;
+constexpr int OUTPUT_HEIGHT = 1080;
+
+// Built once by the engine's own PTZ view: every benchmark walks the same table.
+SimpleImageMap const& BenchMap() {
+    static SimpleImageMap const map = [] {
+        SinglePtzView view = bench::MakeBenchPtzView(OUTPUT_WIDTH, OUTPUT_HEIGHT);
+        view.BuildMap();
+        return *view.GetImageMap();
+    }();
+    return map;
+}
+
+size_t FrameBytes(_DEWARP_IMAGE_FORMAT format, size_t width, size_t height) {
+    size_t const plane = width * height;
+    switch (format) {
+        case DEWARP_IMAGE_FORMAT_RGB32_PACKED:
+            return plane * 4;
+        case DEWARP_IMAGE_FORMAT_YUV422A_PACKED:
+        case DEWARP_IMAGE_FORMAT_YUV422B_PACKED:
+        case DEWARP_IMAGE_FORMAT_YUV422_PLANAR:
+            return plane * 2;
+        case DEWARP_IMAGE_FORMAT_YUV420_PLANAR:
+        case DEWARP_IMAGE_FORMAT_NV420_PLANAR:
+            return plane + plane / 2;
+        case DEWARP_IMAGE_FORMAT_YUV411_PLANAR:
+            return plane + plane / 8;
+    }
+    return plane * 4;
+}
+
+/// A frame over bytes of its own, rows without padding.
+struct BenchFrame {
+    BenchFrame(_DEWARP_IMAGE_FORMAT format, size_t width, size_t height)
+        : bytes(FrameBytes(format, width, height)), image{{format, width, height, width}, nullptr} {
+        for (size_t i = 0; i < bytes.size(); ++i) {
+            bytes[i] = static_cast<unsigned char>(i * 7 + 3);
+        }
+        image.data = bytes.data();
+    }
+    BenchFrame(BenchFrame const&) = delete;
+    BenchFrame& operator=(BenchFrame const&) = delete;
+
+    std::vector<unsigned char> bytes;
+    _DEWARP_IMAGE image;
+};
+
+void SetProcessed(benchmark::State& state, size_t output_bytes) {
+    state.SetItemsProcessed(int64_t(state.iterations()) * OUTPUT_WIDTH * OUTPUT_HEIGHT);
+    state.SetBytesProcessed(int64_t(state.iterations()) * int64_t(output_bytes));
+}
+
+// Bytes per second count the output frame, so that the figures meet the memcpy's.
+void RunRemap(benchmark::State& state, _DEWARP_IMAGE_FORMAT format) {
+    SimpleImageMap const& map = BenchMap();
+    BenchFrame const source(format, SOURCE_SIDE, SOURCE_SIDE);
+    BenchFrame destination(format, OUTPUT_WIDTH, OUTPUT_HEIGHT);
+    for (auto _ : state) {
+        map.Remap(source.image, destination.image);
+        benchmark::DoNotOptimize(destination.bytes.data());
+        benchmark::ClobberMemory();
+    }
+    SetProcessed(state, destination.bytes.size());
+}
+
+void BM_SimpleImageMap_RemapRgb32Packed(benchmark::State& state) {
+    RunRemap(state, DEWARP_IMAGE_FORMAT_RGB32_PACKED);
+}
+BENCHMARK(BM_SimpleImageMap_RemapRgb32Packed);
+
+void BM_SimpleImageMap_RemapYuv422aPacked(benchmark::State& state) {
+    RunRemap(state, DEWARP_IMAGE_FORMAT_YUV422A_PACKED);
+}
+BENCHMARK(BM_SimpleImageMap_RemapYuv422aPacked);
+
+void BM_SimpleImageMap_RemapYuv422bPacked(benchmark::State& state) {
+    RunRemap(state, DEWARP_IMAGE_FORMAT_YUV422B_PACKED);
+}
+BENCHMARK(BM_SimpleImageMap_RemapYuv422bPacked);
+
+void BM_SimpleImageMap_RemapYuv422Planar(benchmark::State& state) {
+    RunRemap(state, DEWARP_IMAGE_FORMAT_YUV422_PLANAR);
+}
+BENCHMARK(BM_SimpleImageMap_RemapYuv422Planar);
+
+void BM_SimpleImageMap_RemapYuv420Planar(benchmark::State& state) {
+    RunRemap(state, DEWARP_IMAGE_FORMAT_YUV420_PLANAR);
+}
+BENCHMARK(BM_SimpleImageMap_RemapYuv420Planar);
+
+void BM_SimpleImageMap_RemapYuv411Planar(benchmark::State& state) {
+    RunRemap(state, DEWARP_IMAGE_FORMAT_YUV411_PLANAR);
+}
+BENCHMARK(BM_SimpleImageMap_RemapYuv411Planar);
+
+void BM_SimpleImageMap_RemapNv420Planar(benchmark::State& state) {
+    RunRemap(state, DEWARP_IMAGE_FORMAT_NV420_PLANAR);
+}
+BENCHMARK(BM_SimpleImageMap_RemapNv420Planar);
+
+// The floor: copying the output frame's bytes (4:2:0, 4:2:2, RGB32) from one buffer to another.
+void BM_Memcpy_OutputFrame(benchmark::State& state) {
+    size_t const bytes = size_t(state.range(0));
+    std::vector<unsigned char> const from(bytes, 7);
+    std::vector<unsigned char> to(bytes);
+    for (auto _ : state) {
+        std::memcpy(to.data(), from.data(), bytes);
+        benchmark::DoNotOptimize(to.data());
+        benchmark::ClobberMemory();
+    }
+    SetProcessed(state, bytes);
+}
+BENCHMARK(BM_Memcpy_OutputFrame)
+    ->Arg(OUTPUT_WIDTH* OUTPUT_HEIGHT * 3 / 2)
+    ->Arg(OUTPUT_WIDTH* OUTPUT_HEIGHT * 2)
+    ->Arg(OUTPUT_WIDTH* OUTPUT_HEIGHT * 4);
+
+#ifdef VEXMAP_BENCH_WITH_OPENCV
+/// The same 4:2:0 frame through cv::remap: the luma plane with the full map, each chroma plane
+/// with a half-size map of the blocks' top left entries, all in fixed point and one thread.
+class OpenCvYuv420Remap {
+public:
+    OpenCvYuv420Remap(SimpleImageMap const& map, _DEWARP_IMAGE const& source,
+                      _DEWARP_IMAGE& destination) {
+        int const width = int(destination.info.width);
+        int const height = int(destination.info.height);
+        int const side = int(source.info.height);
+        size_t const plane = source.info.height * source.info.stride;
+        size_t const out_plane = destination.info.height * destination.info.stride;
+        luma = cv::Mat(side, side, CV_8UC1, source.data, source.info.stride);
+        u = cv::Mat(side / 2, side / 2, CV_8UC1, source.data + plane, source.info.stride / 2);
+        v = cv::Mat(side / 2, side / 2, CV_8UC1, source.data + plane + plane / 4,
+                    source.info.stride / 2);
+        out_luma = cv::Mat(height, width, CV_8UC1, destination.data, destination.info.stride);
+        out_u = cv::Mat(height / 2, width / 2, CV_8UC1, destination.data + out_plane,
+                        destination.info.stride / 2);
+        out_v = cv::Mat(height / 2, width / 2, CV_8UC1,
+                        destination.data + out_plane + out_plane / 4, destination.info.stride / 2);
+        cv::Mat x(height, width, CV_32FC1);
+        cv::Mat y(height, width, CV_32FC1);
+        cv::Mat half_x(height / 2, width / 2, CV_32FC1);
+        cv::Mat half_y(height / 2, width / 2, CV_32FC1);
+        unsigned short const* entry = map.GetMap();
+        int const pitch = map.GetMapWidth();
+        for (int row = 0; row < height; ++row) {
+            for (int column = 0; column < width; ++column) {
+                unsigned short const* const e = entry + 2 * (row * pitch + column);
+                // Words beyond a 16-bit signed coordinate are outside the picture either way.
+                bool const usable = e[0] <= 32767 && e[1] <= 32767;
+                x.at<float>(row, column) = usable ? float(e[0]) : -1.0f;
+                y.at<float>(row, column) = usable ? float(e[1]) : -1.0f;
+                if (row % 2 == 0 && column % 2 == 0) {
+                    half_x.at<float>(row / 2, column / 2) = usable ? float(e[0] >> 1) : -1.0f;
+                    half_y.at<float>(row / 2, column / 2) = usable ? float(e[1] >> 1) : -1.0f;
+                }
+            }
+        }
+        cv::Mat unused;
+        cv::convertMaps(x, y, luma_map, unused, CV_16SC2, true);
+        cv::convertMaps(half_x, half_y, chroma_map, unused, CV_16SC2, true);
+    }
+
+    void operator()() {
+        cv::remap(luma, out_luma, luma_map, cv::noArray(), cv::INTER_NEAREST, cv::BORDER_CONSTANT,
+                  cv::Scalar(16));
+        cv::remap(u, out_u, chroma_map, cv::noArray(), cv::INTER_NEAREST, cv::BORDER_CONSTANT,
+                  cv::Scalar(128));
+        cv::remap(v, out_v, chroma_map, cv::noArray(), cv::INTER_NEAREST, cv::BORDER_CONSTANT,
+                  cv::Scalar(128));
+    }
+
+private:
+    cv::Mat luma;
+    cv::Mat u;
+    cv::Mat v;
+    cv::Mat out_luma;
+    cv::Mat out_u;
+    cv::Mat out_v;
+    cv::Mat luma_map;
+    cv::Mat chroma_map;
+};
+
+// The thread's processor time, as the benchmark library counts it, so that a busy machine
+// does not load one side of the comparison more than the other.
+double ThreadSeconds() {
+    timespec now{};
+    clock_gettime(CLOCK_THREAD_CPUTIME_ID, &now);
+    return double(now.tv_sec) + double(now.tv_nsec) * 1e-9;
+}
+
+// Reports `vexmap_speedup`, OpenCV's time over ours for a frame, from runs taken in turns after
+// the timed loop, so that both meet the same state of the caches and the machine.
+void BM_OpenCv_RemapYuv420Planar(benchmark::State& state) {
+    cv::setNumThreads(1);
+    SimpleImageMap const& map = BenchMap();
+    BenchFrame const source(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, SOURCE_SIDE, SOURCE_SIDE);
+    BenchFrame destination(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, OUTPUT_WIDTH, OUTPUT_HEIGHT);
+    BenchFrame ours(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, OUTPUT_WIDTH, OUTPUT_HEIGHT);
+    OpenCvYuv420Remap opencv(map, source.image, destination.image);
+    opencv();
+    map.Remap(source.image, ours.image);
+    if (destination.bytes != ours.bytes) {
+        state.SkipWithError("OpenCV and SimpleImageMap disagree: not the same work");
+        return;
+    }
+    for (auto _ : state) {
+        opencv();
+        benchmark::DoNotOptimize(destination.bytes.data());
+        benchmark::ClobberMemory();
+    }
+    SetProcessed(state, destination.bytes.size());
+
+    double opencv_seconds = 0.0;
+    double our_seconds = 0.0;
+    for (int round = 0; round < 20; ++round) {
+        double const start = ThreadSeconds();
+        opencv();
+        double const middle = ThreadSeconds();
+        map.Remap(source.image, ours.image);
+        double const end = ThreadSeconds();
+        opencv_seconds += middle - start;
+        our_seconds += end - middle;
+    }
+    state.counters["vexmap_speedup"] = opencv_seconds / our_seconds;
+}
+BENCHMARK(BM_OpenCv_RemapYuv420Planar);
+#endif
+
+}  // namespace
+}  // namespace quorvel::vexmap
