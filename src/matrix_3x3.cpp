@@ -60,10 +60,6 @@ Vector3d Matrix3x3::operator*(Vector3d const& v) const {
                     m31 * v.x + m32 * v.y + m33 * v.z);
 }
 
-Vector2d Matrix3x3::operator*(Vector2d const& p) const {
-    return Vector2d(m11 * p.x + m12 * p.y + m13, m21 * p.x + m22 * p.y + m23);
-}
-
 void Matrix3x3::SetIdentity() {
     Set(1.0f, 0.0f, 0.0f, 0.0f, 1.0f, 0.0f, 0.0f, 0.0f, 1.0f);
 }

@@ -91,14 +91,4 @@ void RotationMatrix3d::FromQuaternion(Quaternion const& q, float w_sign) {
     m33 = 1.0f - 2.0f * (q.x * q.x + q.y * q.y);
 }
 
-Vector3d RotationMatrix3d::InertialToObject(Vector3d const& v) const {
-    return Vector3d(m11 * v.x + m21 * v.y + m31 * v.z, m12 * v.x + m22 * v.y + m32 * v.z,
-                    m13 * v.x + m23 * v.y + m33 * v.z);
-}
-
-Vector3d RotationMatrix3d::ObjectToInertial(Vector3d const& v) const {
-    return Vector3d(m11 * v.x + m12 * v.y + m13 * v.z, m21 * v.x + m22 * v.y + m23 * v.z,
-                    m31 * v.x + m32 * v.y + m33 * v.z);
-}
-
 }  // namespace quorvel::vexmap

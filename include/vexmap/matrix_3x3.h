@@ -24,7 +24,9 @@ public:
     Matrix3x3 operator*(Matrix3x3 const& other) const;
     Vector3d operator*(Vector3d const& vector) const;
     /// (x, y, 1) through the first two rows; the third row takes no part, nothing is divided.
-    Vector2d operator*(Vector2d const& point) const;
+    Vector2d operator*(Vector2d const& point) const {  // inline: a map build's scale link
+        return Vector2d(m11 * point.x + m12 * point.y + m13, m21 * point.x + m22 * point.y + m23);
+    }
 
     void SetIdentity();
     /// True when each diagonal element differs from 1 and the others are zero: inverted as ==.

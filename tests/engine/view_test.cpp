@@ -1,6 +1,7 @@
 #include "vexmap/view.h"
 
 #include <limits>
+#include <random>
 #include <vector>
 
 #include <gmock/gmock.h>
@@ -455,6 +456,60 @@ TEST(View, AnOutputWithoutColumnsOrRowsGetsATableWithoutEntries) {
         view.BuildMap();
         ASSERT_TRUE(view.GetImageMap());
         EXPECT_EQ(size, view.GetImageMap()->GetMapSize());
+    }
+}
+
+/// The builders' span store, reached from a test.
+struct SpanStore : View {
+    using View::StoreSpan;
+};
+
+// The eight words pairs of a span of 8, halved and rounded plainly.
+std::vector<Entry> ExpectedSpan(Vector2d const& p, Vector2d const& q, Vector2d const& centre) {
+    auto half = [](Vector2d const& a, Vector2d const& b) {
+        return Vector2d((a.x + b.x) * 0.5f, (a.y + b.y) * 0.5f);
+    };
+    Vector2d const m4 = half(p, q);
+    Vector2d const m2 = half(p, m4);
+    Vector2d const m6 = half(m4, q);
+    std::vector<Entry> entries;
+    for (Vector2d const& m :
+         {half(p, m2), m2, half(m2, m4), m4, half(m4, m6), m6, half(m6, q), q}) {
+        entries.push_back(Entry{ExpectedWord(m.x + centre.x), ExpectedWord(m.y + centre.y)});
+    }
+    return entries;
+}
+
+std::vector<Entry> StoredSpan(Vector2d const& p, Vector2d const& q, Vector2d const& centre) {
+    std::vector<unsigned short> words(16, 0xABCD);
+    unsigned short* cursor = words.data();
+    SpanStore::StoreSpan(cursor, p, q, centre, 8);
+    EXPECT_EQ(words.data() + 16, cursor);
+    std::vector<Entry> entries;
+    for (std::size_t i = 0; i < 16; i += 2) {
+        entries.push_back(Entry{words[i], words[i + 1]});
+    }
+    return entries;
+}
+
+TEST(View, ASpanStoresItsHalvedPointsRoundedWrappedAndClampedAsOneWordAtATime) {
+    std::mt19937 random(11);
+    std::uniform_real_distribution<float> coordinate(-70000.0f, 140000.0f);
+    for (int i = 0; i < 20000; ++i) {
+        Vector2d const p(coordinate(random), coordinate(random));
+        Vector2d const q(coordinate(random), coordinate(random));
+        Vector2d const centre(float(i % 3000), 1440.0f);
+        ASSERT_EQ(ExpectedSpan(p, q, centre), StoredSpan(p, q, centre)) << i;
+    }
+}
+
+TEST(View, ASpanWithAFarOrMissingPointStoresEveryWordAsTheStoringRuleSays) {
+    float const nan = std::numeric_limits<float>::quiet_NaN();
+    Vector2d const centre(1440.0f, 1440.0f);
+    for (Vector2d const& q : {Vector2d(nan, 10.0f), Vector2d(10.0f, -5.0e9f),
+                              Vector2d(6.0e6f, 20.0f), Vector2d(-4194304.0f, 1.0f)}) {
+        EXPECT_EQ(ExpectedSpan(Vector2d(3.0f, 4.0f), q, centre),
+                  StoredSpan(Vector2d(3.0f, 4.0f), q, centre));
     }
 }
 
