@@ -3,6 +3,7 @@
 #include <cstring>
 #include <new>
 
+#include "BrenviaDewarper.h"
 #include "CameraTable.h"
 #include "Sentry360Dewarper.h"
 
@@ -53,6 +54,8 @@ void DewarperRegistry::Register(char const* dll, char const* name, bool hasPosit
 DewarperRegistry::DewarperRegistry() {
     Register<Sentry360Dewarper>("360API.dll", "Sentry360", true, false, true, true,
                                 DewarperType::DewarperSentry360);
+    Register<BrenviaDewarper>(nullptr, "Brenvia", true, false, false, true,
+                              DewarperType::DewarperBrenvia);
 }
 
 DewarperRegistry::~DewarperRegistry() {

@@ -24,7 +24,7 @@ if [ ${#missing[@]} -ne 0 ]; then
     apt-get install -y -qq --no-install-recommends "${missing[@]}" >/dev/null
 fi
 
-benches=(image_processor_bench engine_bench)
+benches=(image_processor_bench engine_bench classes_bench)
 cmake -S . -B build-bench -G Ninja -DCMAKE_BUILD_TYPE=Release -DVEXMAP_BUILD_TESTS=OFF \
       -DVEXMAP_BUILD_TOOLS=OFF >/dev/null
 cmake --build build-bench -j "$(nproc)" --target "${benches[@]}"

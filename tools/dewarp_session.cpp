@@ -24,8 +24,7 @@ DewarpSession::~DewarpSession() {
 }
 
 // The sub-mode goes first: changing it may put the position back to the kind's defaults.
-RgbImage DewarpSession::Render(int sub_mode, RequestedPosition const& position,
-                               RgbImage const& input, int width, int height, int frames) const {
+void DewarpSession::Aim(int sub_mode, RequestedPosition const& position) const {
     dewarper->SetSubMode(sub_mode);
     if (position.pan || position.tilt || position.zoom) {
         float pan = 0.0f;
@@ -35,6 +34,11 @@ RgbImage DewarpSession::Render(int sub_mode, RequestedPosition const& position,
         dewarper->SetPosition(position.pan.value_or(pan), position.tilt.value_or(tilt),
                               position.zoom.value_or(zoom));
     }
+}
+
+RgbImage DewarpSession::Render(int sub_mode, RequestedPosition const& position,
+                               RgbImage const& input, int width, int height, int frames) const {
+    Aim(sub_mode, position);
     RgbImage picture;
     for (int frame = 0; frame < frames; ++frame) {
         picture = RunFrame(input, width, height);
@@ -43,6 +47,21 @@ RgbImage DewarpSession::Render(int sub_mode, RequestedPosition const& position,
 }
 
 RgbImage DewarpSession::RunFrame(RgbImage const& input, int width, int height) const {
+    Feed(input);
+    Output const output = Fetch(width, height);
+    return PixelFormat(output.format)
+        .Decode(output.width, output.height, output.buffer, output.size);
+}
+
+YuvImage DewarpSession::RunFrame(YuvImage const& input, int width, int height) const {
+    Feed(input);
+    Output const output = Fetch(width, height);
+    return PixelFormat(output.format)
+        .DecodeYuv(output.width, output.height, output.buffer, output.size);
+}
+
+template <typename Picture>
+void DewarpSession::Feed(Picture const& input) const {
     unsigned char* input_buffer = nullptr;
     unsigned int input_size = 0;
     int input_format = 0;
@@ -52,21 +71,21 @@ RgbImage DewarpSession::RunFrame(RgbImage const& input, int width, int height) c
                         SizeText(input.width, input.height));
     }
     PixelFormat(input_format).Encode(input, input_buffer, input_size);
-    int output_width = width;
-    int output_height = height;
-    unsigned char* output_buffer = nullptr;
-    unsigned int output_size = 0;
-    int output_format = 0;
-    if (!dewarper->GetImageOutputBuffer(&output_width, &output_height, &output_buffer, &output_size,
-                                        &output_format)) {
+}
+
+DewarpSession::Output DewarpSession::Fetch(int width, int height) const {
+    Output output{width, height, nullptr, 0, 0};
+    unsigned char* buffer = nullptr;
+    if (!dewarper->GetImageOutputBuffer(&output.width, &output.height, &buffer, &output.size,
+                                        &output.format)) {
         throw ToolError("the dewarper gave no picture for an output of " + SizeText(width, height));
     }
-    if (output_width <= 0 || output_height <= 0) {
+    if (output.width <= 0 || output.height <= 0) {
         throw ToolError("the dewarper gave an empty picture of " +
-                        SizeText(output_width, output_height));
+                        SizeText(output.width, output.height));
     }
-    return PixelFormat(output_format)
-        .Decode(output_width, output_height, output_buffer, output_size);
+    output.buffer = buffer;
+    return output;
 }
 
 }  // namespace vexmap_host

@@ -1,10 +1,16 @@
 // vexmap: loads the dewarping plug-in as a surveillance client does and dewarps a still picture,
-// or a built-in sample, into one PNG file per view kind of the chosen dewarper.
+// a built-in sample or a YUV4MPEG2 stream, into one PNG file per view kind of the chosen dewarper
+// or into a YUV4MPEG2 stream of one view.
 
 #include <algorithm>
 #include <cctype>
+#include <cerrno>
+#include <cinttypes>
 #include <cstdio>
+#include <cstring>
 #include <filesystem>
+#include <fstream>
+#include <iostream>
 #include <optional>
 #include <string>
 #include <unistd.h>
@@ -14,9 +20,13 @@
 
 #include "dewarp_session.h"
 #include "image_file.h"
+#include "pixel_format.h"
 #include "plugin_host.h"
+#include "progress_line.h"
 #include "sample_scene.h"
 #include "tool_error.h"
+#include "y4m_reader.h"
+#include "y4m_writer.h"
 
 namespace {
 
@@ -24,6 +34,9 @@ using namespace vexmap_host;
 
 constexpr int SAMPLE_SIZE = 1024;
 constexpr int USAGE_ERROR = 2;
+constexpr char const* DEFAULT_KIND = "Brenvia";
+constexpr char const* STANDARD_STREAM = "-";
+constexpr int STILL_RATE = 25;  // frames a second of a stream made from a still
 
 struct Circle {
     int x = 0;
@@ -48,6 +61,7 @@ struct Options {
     std::string output = "out";
     std::string plugin;
     int frames = 2;
+    bool quiet = false;
 };
 
 char const* ViewName(int sub_mode) {
@@ -73,8 +87,22 @@ std::string DefaultPluginPath() {
     return error ? "libvexmap_dewarp.so" : (self.parent_path() / "libvexmap_dewarp.so").string();
 }
 
+bool EndsWith(std::string const& path, std::string const& extension) {
+    return path.size() > extension.size() &&
+           Lowercase(path.substr(path.size() - extension.size())) == extension;
+}
+
 bool EndsWithPng(std::string const& path) {
-    return path.size() > 4 && Lowercase(path.substr(path.size() - 4)) == ".png";
+    return EndsWith(path, ".png");
+}
+
+// "-" is the standard stream of its side; a path ending in .y4m is a file.
+bool IsStream(std::string const& path) {
+    return path == STANDARD_STREAM || EndsWith(path, ".y4m");
+}
+
+std::string StreamName(std::string const& path, char const* standard_name) {
+    return path == STANDARD_STREAM ? standard_name : path;
 }
 
 // A path ending in .png names the file (with the view inserted when there are several views);
@@ -133,7 +161,7 @@ Choice ChooseMode(PluginHost const& host, Options const& options) {
         }
         choice.how = "by camera " + CameraText(options);
     } else {
-        std::string const kind = options.kind.empty() ? "Sentry360" : options.kind;
+        std::string const kind = options.kind.empty() ? DEFAULT_KIND : options.kind;
         choice = {registry.GetModeByName(kind.c_str()),
                   options.kind.empty() ? "by default" : "by name"};
         if (choice.mode == 0) {
@@ -150,32 +178,122 @@ Choice ChooseMode(PluginHost const& host, Options const& options) {
     return choice;
 }
 
-void RequireCircleInside(Circle const& circle, RgbImage const& picture) {
-    if (circle.radius <= 0 || circle.x < 0 || circle.y < 0 || circle.x >= picture.width ||
-        circle.y >= picture.height) {
+void RequireCircleInside(Circle const& circle, int width, int height) {
+    if (circle.radius <= 0 || circle.x < 0 || circle.y < 0 || circle.x >= width ||
+        circle.y >= height) {
         throw ToolError("the circle " + std::to_string(circle.x) + "," + std::to_string(circle.y) +
                         "," + std::to_string(circle.radius) + " lies outside the " +
-                        std::to_string(picture.width) + "x" + std::to_string(picture.height) +
-                        " picture");
+                        std::to_string(width) + "x" + std::to_string(height) + " picture");
     }
+}
+
+// An open input: a still picture, or a stream whose frames are still to come.
+struct Source {
+    RgbImage picture;  // a still, or the first frame of a stream when the output is pictures
+    std::ifstream file;
+    std::optional<Y4mReader> reader;
+};
+
+// The still, or the stream's header; a stream read into pictures gives its first frame.
+void Open(Options const& options, Source& source, Circle& circle) {
+    if (options.input.empty()) {
+        SampleFisheye sample = MakeSampleFisheye(SAMPLE_SIZE);
+        source.picture = std::move(sample.image);
+        circle = {sample.circle_x, sample.circle_y, sample.circle_radius};
+        return;
+    }
+    int width = 0;
+    int height = 0;
+    if (IsStream(options.input)) {
+        std::istream* stream = &std::cin;
+        if (options.input != STANDARD_STREAM) {
+            source.file.open(options.input, std::ios::binary);
+            if (!source.file) {
+                throw ToolError("cannot read " + options.input + ": " + strerror(errno));
+            }
+            stream = &source.file;
+        }
+        source.reader.emplace(*stream, StreamName(options.input, "standard input"));
+        width = source.reader->Header().width;
+        height = source.reader->Header().height;
+        if (!IsStream(options.output)) {
+            YuvImage first;
+            if (!source.reader->ReadFrame(first)) {
+                throw ToolError(StreamName(options.input, "standard input") + " holds no frame");
+            }
+            source.picture = PixelFormat::ToRgb(first);
+            source.reader.reset();
+        }
+    } else {
+        source.picture = ReadImage(options.input);
+        width = source.picture.width;
+        height = source.picture.height;
+    }
+    // Without a circle, the largest one centred in the picture.
+    circle = {width / 2, height / 2, std::min(width, height) / 2};
+}
+
+struct StreamRun {
+    uint64_t frames = 0;
+    int width = 0;
+    int height = 0;
+};
+
+// One view into a stream, frame by frame through the one dewarper, which builds its map for the
+// first frame and replays it for the others. A still gives a stream of one frame.
+StreamRun WriteStream(Options const& options, DewarpSession const& session, int sub_mode,
+                      Source& source) {
+    std::ofstream file;
+    std::ostream* stream = &std::cout;
+    if (options.output != STANDARD_STREAM) {
+        file.open(options.output, std::ios::binary | std::ios::trunc);
+        if (!file) {
+            throw ToolError("cannot write " + options.output + ": " + strerror(errno));
+        }
+        stream = &file;
+    }
+    int numerator = STILL_RATE;
+    int denominator = 1;
+    if (source.reader) {
+        numerator = source.reader->Header().rate_numerator;
+        denominator = source.reader->Header().rate_denominator;
+    }
+    Y4mWriter writer(*stream, StreamName(options.output, "standard output"), numerator,
+                     denominator);
+    session.Aim(sub_mode, options.ptz);
+    StreamRun run;
+    if (!source.reader) {
+        YuvImage const still = PixelFormat::ToYuv(source.picture);
+        YuvImage view;
+        for (int frame = 0; frame < options.frames; ++frame) {
+            view = session.RunFrame(still, options.width, options.height);
+        }
+        writer.WriteFrame(view);
+        return {1, view.width, view.height};
+    }
+    ProgressLine progress(stderr, !options.quiet && isatty(STDERR_FILENO) != 0);
+    YuvImage frame;
+    while (source.reader->ReadFrame(frame)) {
+        YuvImage const view = session.RunFrame(frame, options.width, options.height);
+        writer.WriteFrame(view);
+        run = {writer.FramesWritten(), view.width, view.height};
+        progress.Show(run.frames);
+    }
+    if (run.frames == 0) {
+        throw ToolError(StreamName(options.input, "standard input") + " holds no frame");
+    }
+    return run;
 }
 
 int Run(Options const& options) {
     PluginHost const host(options.plugin.empty() ? DefaultPluginPath() : options.plugin);
-    RgbImage picture;
+    Source source;
     Circle circle;
-    if (options.input.empty()) {
-        SampleFisheye sample = MakeSampleFisheye(SAMPLE_SIZE);
-        picture = std::move(sample.image);
-        circle = {sample.circle_x, sample.circle_y, sample.circle_radius};
-    } else {
-        picture = ReadImage(options.input);
-        // Without a circle, the largest one centred in the picture.
-        circle = {picture.width / 2, picture.height / 2,
-                  std::min(picture.width, picture.height) / 2};
-    }
+    Open(options, source, circle);
     circle = options.circle.value_or(circle);
-    RequireCircleInside(circle, picture);
+    int const input_width = source.reader ? source.reader->Header().width : source.picture.width;
+    int const input_height = source.reader ? source.reader->Header().height : source.picture.height;
+    RequireCircleInside(circle, input_width, input_height);
 
     Choice const choice = ChooseMode(host, options);
     int const mode = choice.mode;
@@ -196,36 +314,65 @@ int Run(Options const& options) {
     }
     DewarpSession const session(host, mode, params);
 
+    bool const stream_out = IsStream(options.output);
     std::vector<int> sub_modes;
-    for (int sub_mode = 1; sub_mode <= 3; ++sub_mode) {
-        if (options.sub_mode ? *options.sub_mode == sub_mode
-                             : session.Get().IsSubModeSupported(sub_mode)) {
-            sub_modes.push_back(sub_mode);
+    if (options.sub_mode || stream_out) {
+        // A stream carries one view: the PTZ one unless another is asked for.
+        int const sub_mode = options.sub_mode.value_or(1);
+        if (!session.Get().IsSubModeSupported(sub_mode)) {
+            throw ToolError("the " + kind + " dewarper has no sub-mode " +
+                            std::to_string(sub_mode));
+        }
+        sub_modes.push_back(sub_mode);
+    } else {
+        for (int sub_mode = 1; sub_mode <= 3; ++sub_mode) {
+            if (session.Get().IsSubModeSupported(sub_mode)) {
+                sub_modes.push_back(sub_mode);
+            }
         }
     }
-    if (options.sub_mode && !session.Get().IsSubModeSupported(*options.sub_mode)) {
-        throw ToolError("the " + kind + " dewarper has no sub-mode " +
-                        std::to_string(*options.sub_mode));
+    // With the stream on standard output, what the tool has to say goes to standard error.
+    FILE* const info = options.quiet                       ? nullptr
+                       : options.output == STANDARD_STREAM ? stderr
+                                                           : stdout;
+    if (stream_out) {
+        StreamRun const run = WriteStream(options, session, sub_modes.front(), source);
+        // For a stream the lines come at its end, so that a failure midway is one line alone.
+        if (info != nullptr) {
+            fprintf(info, "%s dewarper (mode %d), chosen %s\n", kind.c_str(), mode,
+                    choice.how.c_str());
+            fprintf(info, "%s %s view, %dx%d, %" PRIu64 " frame%s: %s\n", kind.c_str(),
+                    ViewName(sub_modes.front()), run.width, run.height, run.frames,
+                    run.frames == 1 ? "" : "s",
+                    StreamName(options.output, "standard output").c_str());
+        }
+        return 0;
     }
     // Printed once only rendering and writing can fail, so that a refusal leaves stdout empty.
-    printf("%s dewarper (mode %d), chosen %s\n", kind.c_str(), mode, choice.how.c_str());
+    if (info != nullptr) {
+        fprintf(info, "%s dewarper (mode %d), chosen %s\n", kind.c_str(), mode, choice.how.c_str());
+    }
     for (int const sub_mode : sub_modes) {
-        RgbImage const view = session.Render(sub_mode, options.ptz, picture, options.width,
+        RgbImage const view = session.Render(sub_mode, options.ptz, source.picture, options.width,
                                              options.height, options.frames);
         std::string const path = OutputPath(options, kind, sub_mode, sub_modes.size() > 1);
         WritePng(path, view);
-        printf("%s %s view, %dx%d: %s\n", kind.c_str(), ViewName(sub_mode), view.width, view.height,
-               path.c_str());
+        if (info != nullptr) {
+            fprintf(info, "%s %s view, %dx%d: %s\n", kind.c_str(), ViewName(sub_mode), view.width,
+                    view.height, path.c_str());
+        }
     }
     return 0;
 }
 
 void AddOptions(CLI::App& app, Options& options) {
     app.add_option("--input", options.input,
-                   "PNG or JPEG fisheye picture (default: built-in sample)");
+                   "PNG or JPEG fisheye picture, or YUV4MPEG2 stream (.y4m, or - for standard "
+                   "input); a stream written as pictures gives its first frame (default: built-in "
+                   "sample)");
     auto* mode = app.add_option("--mode", options.mode, "dewarper mode number");
     auto* kind =
-        app.add_option("--kind", options.kind, "dewarper kind by display name (default: Sentry360)")
+        app.add_option("--kind", options.kind, "dewarper kind by display name (default: Brenvia)")
             ->excludes(mode);
     app.add_option("--make", options.make,
                    "camera make as the device reports it; the camera picks the kind as a client "
@@ -238,8 +385,10 @@ void AddOptions(CLI::App& app, Options& options) {
     app.add_option("--url", options.url, "stream URL of the camera")
         ->excludes(mode)
         ->excludes(kind);
-    app.add_option("--submode", options.sub_mode,
-                   "view kind: 1 PTZ, 2 panorama, 3 dual panorama (default: every supported one)")
+    app.add_option(
+           "--submode", options.sub_mode,
+           "view kind: 1 PTZ, 2 panorama, 3 dual panorama (default: every supported one; PTZ "
+           "for a stream)")
         ->check(CLI::Range(1, 3));
     app.add_option("--position", options.position, "camera mount: wall, ceiling or floor")
         ->transform(CLI::CheckedTransformer(
@@ -276,13 +425,16 @@ void AddOptions(CLI::App& app, Options& options) {
         },
         "wished output size WIDTHxHEIGHT; the dewarper has the last word (default: 960x540)");
     app.add_option("--output", options.output,
-                   "PNG file, or directory for one file per view (default: out)");
+                   "PNG file, directory for one file per view, or YUV4MPEG2 stream of one view "
+                   "(.y4m, or - for standard output; a still gives one frame) (default: out)");
     app.add_option("--plugin", options.plugin,
                    "plug-in to load (default: libvexmap_dewarp.so beside this program)");
     app.add_option("--frames", options.frames,
-                   "frames run per view; from the second on a dewarper replays its cached map, "
-                   "as in a live stream (default: 2)")
+                   "frames run per view of a still; from the second on a dewarper replays its "
+                   "cached map, as in a live stream (default: 2)")
         ->check(CLI::Range(1, 1000));
+    app.add_flag("--quiet", options.quiet,
+                 "say nothing but errors: no list of views written, no progress of a stream");
 }
 
 }  // namespace

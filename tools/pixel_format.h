@@ -3,13 +3,16 @@
 #include <cstddef>
 
 #include "rgb_image.h"
+#include "yuv_image.h"
 
 namespace vexmap_host {
 
 /// The frame formats of the plug-in as this host decodes them. Format 3 is 24-bit RGB in the order
-/// of the file; a format the tool does not know is refused with a ToolError.
+/// of the file; format 0 is planar 4:2:0 (luma, then U, then V) with BT.601 limited-range values,
+/// and takes only even sizes. A format the tool does not know is refused with a ToolError.
 class PixelFormat {
 public:
+    static constexpr int I420 = 0;
     static constexpr int RGB24 = 3;
 
     explicit PixelFormat(int format);  // throws ToolError for a format the tool cannot convert
@@ -17,13 +20,26 @@ public:
     PixelFormat& operator=(PixelFormat const&) = default;
     virtual ~PixelFormat() = default;
 
+    /// The byte count of the plug-in for a frame; 0 for an empty or negative size.
     std::size_t FrameBytes(int width, int height) const;
-    /// Fills a frame buffer of `size` bytes from `image`; throws if the size does not match.
+    /// Fill a frame buffer of `size` bytes from a picture, converting its colours when the format
+    /// differs; throw if the size does not match. A 4:2:0 picture goes into format 0 unchanged.
     void Encode(RgbImage const& image, unsigned char* buffer, std::size_t size) const;
+    void Encode(YuvImage const& image, unsigned char* buffer, std::size_t size) const;
     RgbImage Decode(int width, int height, unsigned char const* buffer, std::size_t size) const;
+    YuvImage DecodeYuv(int width, int height, unsigned char const* buffer, std::size_t size) const;
+
+    /// BT.601 limited range, the range of the plug-in's own black (luma 16, chroma 128) and of
+    /// ordinary 8-bit video. A chroma sample is the mean of the 2 x 2 pixels it covers, which puts
+    /// it at their centre.
+    static YuvImage ToYuv(RgbImage const& image);
+    static RgbImage ToRgb(YuvImage const& image);
 
 private:
     void RequireSize(int width, int height, std::size_t size) const;
+    /// Copies a picture already in this format into a frame buffer.
+    void Store(RgbImage const& image, unsigned char* buffer, std::size_t size) const;
+    void Store(YuvImage const& image, unsigned char* buffer, std::size_t size) const;
 
     int format;
 };

@@ -9,6 +9,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "pixel_format.h"
 #include "plugin_host.h"
 #include "tool_error.h"
 
@@ -19,6 +20,7 @@ using ::testing::HasSubstr;
 using ::testing::ThrowsMessage;
 
 constexpr int SENTRY360 = 2;
+constexpr int IN_HOUSE = 8;
 constexpr int PTZ = 1;
 constexpr int PANORAMA = 2;
 constexpr int SIZE = 256;
@@ -202,6 +204,71 @@ TEST_F(DewarpSessionTest, TurningThePanShowsAnotherPartOfTheCircle) {
         seen.insert(centre);
     }
     EXPECT_EQ(4u, seen.size());
+}
+
+YuvImage UniformYuv(int size, uint8_t y, uint8_t u, uint8_t v) {
+    YuvImage image;
+    image.width = size;
+    image.height = size;
+    std::size_t const pixels = std::size_t(size) * std::size_t(size);
+    image.bytes.assign(pixels, y);
+    image.bytes.insert(image.bytes.end(), pixels / 4, u);
+    image.bytes.insert(image.bytes.end(), pixels / 4, v);
+    return image;
+}
+
+// Luma, U and V at a pixel of an even-sized frame.
+std::array<uint8_t, 3> YuvAt(YuvImage const& image, int column, int row) {
+    std::size_t const width = std::size_t(image.width);
+    std::size_t const pixels = width * std::size_t(image.height);
+    std::size_t const chroma = std::size_t(row / 2) * (width / 2) + std::size_t(column / 2);
+    return {image.bytes[std::size_t(row) * width + std::size_t(column)],
+            image.bytes[pixels + chroma], image.bytes[pixels + pixels / 4 + chroma]};
+}
+
+TEST_F(DewarpSessionTest, InHouseDewarperTakesA420FrameWithoutConversion) {
+    DewarpSession const session(host, IN_HOUSE, CeilingCamera());
+    YuvImage const view = session.RunFrame(UniformYuv(SIZE, 100, 90, 200), 320, 180);
+    EXPECT_EQ(320, view.width);
+    EXPECT_EQ(180, view.height);
+    ASSERT_EQ(std::size_t(320) * 180 * 3 / 2, view.bytes.size());
+    EXPECT_EQ((std::array<uint8_t, 3>{100, 90, 200}), YuvAt(view, 160, 90));
+}
+
+TEST_F(DewarpSessionTest, InHouseDewarperConvertsAnRgbPicture) {
+    DewarpSession const session(host, IN_HOUSE, CeilingCamera());
+    RgbImage const view = session.RunFrame(Disc(SIZE), 320, 180);
+    EXPECT_EQ(320, view.width);
+    EXPECT_EQ(180, view.height);
+    Colour const middle = PixelAt(view, 160, 90);
+    for (std::size_t channel = 0; channel < 3; ++channel) {
+        EXPECT_NEAR(DISC[channel], middle[channel], 2) << "channel " << channel;
+    }
+}
+
+TEST_F(DewarpSessionTest, RgbDewarperTakesA420FrameThroughRgb) {
+    DewarpSession const session(host, SENTRY360, CeilingCamera());
+    YuvImage const input = PixelFormat::ToYuv(Disc(SIZE));
+    YuvImage const view = session.RunFrame(input, 320, 180);
+    EXPECT_EQ(320, view.width);
+    EXPECT_EQ(180, view.height);
+    std::array<uint8_t, 3> const expected = YuvAt(input, SIZE / 2, SIZE / 2);
+    std::array<uint8_t, 3> const middle = YuvAt(view, 160, 90);
+    for (std::size_t plane = 0; plane < 3; ++plane) {
+        EXPECT_NEAR(expected[plane], middle[plane], 1) << "plane " << plane;
+    }
+}
+
+TEST_F(DewarpSessionTest, AimedSubModeHoldsForTheFramesThatFollow) {
+    DewarpSession const session(host, SENTRY360, CeilingCamera());
+    session.Aim(PANORAMA, {});
+    RgbImage const input = Disc(SIZE);
+    for (int frame = 0; frame < 2; ++frame) {
+        RgbImage const view = session.RunFrame(input, 960, 540);
+        EXPECT_EQ(128, view.width);
+        EXPECT_EQ(128, view.height);
+    }
+    EXPECT_EQ(PANORAMA, session.Get().SubMode());
 }
 
 TEST_F(DewarpSessionTest, RefusesAnUnregisteredMode) {

@@ -1,0 +1,236 @@
+#include "y4m_reader.h"
+
+#include <cstdint>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "tool_error.h"
+
+namespace vexmap_host {
+namespace {
+
+using ::testing::HasSubstr;
+using ::testing::ThrowsMessage;
+
+// Byte i of frame f holds f * 16 + i, newlines and zeros among them.
+std::string FrameBytes(std::size_t count, int frame) {
+    std::string bytes(count, '\0');
+    for (std::size_t index = 0; index < count; ++index) {
+        bytes[index] = char(uint8_t(std::size_t(frame) * 16 + index));
+    }
+    return bytes;
+}
+
+std::vector<uint8_t> AsBytes(std::string const& text) {
+    return std::vector<uint8_t>(text.begin(), text.end());
+}
+
+std::string const SMALL_HEADER = "YUV4MPEG2 W4 H2 F30000:1001 It A10:11 C420mpeg2\n";
+
+TEST(Y4mReader, ReadsEveryFieldOfTheHeader) {
+    std::istringstream input(SMALL_HEADER);
+    Y4mReader const reader(input, "in.y4m");
+    Y4mHeader const& header = reader.Header();
+    EXPECT_EQ(4, header.width);
+    EXPECT_EQ(2, header.height);
+    EXPECT_EQ(30000, header.rate_numerator);
+    EXPECT_EQ(1001, header.rate_denominator);
+    EXPECT_EQ('t', header.interlacing);
+    EXPECT_EQ(10, header.aspect_numerator);
+    EXPECT_EQ(11, header.aspect_denominator);
+    EXPECT_EQ("420mpeg2", header.colour_space);
+    EXPECT_EQ(12u, reader.FrameBytes());
+}
+
+TEST(Y4mReader, WidthAndHeightAloneAreEnough) {
+    std::istringstream input("YUV4MPEG2 W6 H4\n");
+    Y4mReader const reader(input, "in.y4m");
+    Y4mHeader const& header = reader.Header();
+    EXPECT_EQ(25, header.rate_numerator);
+    EXPECT_EQ(1, header.rate_denominator);
+    EXPECT_EQ('p', header.interlacing);
+    EXPECT_EQ(0, header.aspect_numerator);
+    EXPECT_EQ(0, header.aspect_denominator);
+    EXPECT_EQ("", header.colour_space);
+}
+
+TEST(Y4mReader, IgnoresExtensionsAndUnknownTags) {
+    std::istringstream input(
+        "YUV4MPEG2 W6 H4 F25:1 XYSCSS=420JPEG XCOLORRANGE=LIMITED Zfuture  Ip\n");
+    Y4mReader const reader(input, "in.y4m");
+    EXPECT_EQ(6, reader.Header().width);
+    EXPECT_EQ('p', reader.Header().interlacing);
+}
+
+TEST(Y4mReader, ChromaOfAnOddSizeIsRoundedUp) {
+    std::istringstream input("YUV4MPEG2 W5 H3\n");
+    EXPECT_EQ(15u + 2u * 3u * 2u, Y4mReader(input, "in.y4m").FrameBytes());
+}
+
+TEST(Y4mReader, TakesTheLargestSide) {
+    std::istringstream input("YUV4MPEG2 W16384 H16384\n");
+    EXPECT_EQ(uint64_t(16384) * 16384 * 3 / 2, Y4mReader(input, "in.y4m").FrameBytes());
+}
+
+TEST(Y4mReader, ReadsFramesInOrderUntilTheEnd) {
+    std::istringstream input(SMALL_HEADER + "FRAME\n" + FrameBytes(12, 1) + "FRAME\n" +
+                             FrameBytes(12, 2) + "FRAME\n" + FrameBytes(12, 3));
+    Y4mReader reader(input, "in.y4m");
+    YuvImage frame;
+    for (int number = 1; number <= 3; ++number) {
+        ASSERT_TRUE(reader.ReadFrame(frame)) << "frame " << number;
+        EXPECT_EQ(4, frame.width);
+        EXPECT_EQ(2, frame.height);
+        EXPECT_EQ(AsBytes(FrameBytes(12, number)), frame.bytes);
+    }
+    EXPECT_FALSE(reader.ReadFrame(frame));
+    EXPECT_FALSE(reader.ReadFrame(frame));
+    EXPECT_EQ(3u, reader.FramesRead());
+}
+
+TEST(Y4mReader, AStreamOfNoFrameEndsAtOnce) {
+    std::istringstream input(SMALL_HEADER);
+    Y4mReader reader(input, "in.y4m");
+    YuvImage frame;
+    EXPECT_FALSE(reader.ReadFrame(frame));
+    EXPECT_EQ(0u, reader.FramesRead());
+}
+
+TEST(Y4mReader, IgnoresTheParametersOfAFrame) {
+    std::istringstream input(SMALL_HEADER + "FRAME Ib XZ=1\n" + FrameBytes(12, 1));
+    Y4mReader reader(input, "in.y4m");
+    YuvImage frame;
+    ASSERT_TRUE(reader.ReadFrame(frame));
+    EXPECT_EQ(AsBytes(FrameBytes(12, 1)), frame.bytes);
+}
+
+TEST(Y4mReader, ReusesTheStorageOfALargerFrame) {
+    std::istringstream input(SMALL_HEADER + "FRAME\n" + FrameBytes(12, 1));
+    Y4mReader reader(input, "in.y4m");
+    YuvImage frame;
+    frame.bytes.assign(100, 0xEE);
+    ASSERT_TRUE(reader.ReadFrame(frame));
+    EXPECT_EQ(AsBytes(FrameBytes(12, 1)), frame.bytes);
+}
+
+TEST(Y4mReader, HeaderOfTheCapIsTakenAndOneByteMoreIsNot) {
+    std::string const start = "YUV4MPEG2 W2 H2 X";
+    std::string const fits = start + std::string(Y4mReader::MAX_LINE - start.size() - 1, 'x');
+    std::istringstream exact(fits + "\n");
+    EXPECT_EQ(2, Y4mReader(exact, "in.y4m").Header().width);
+    std::istringstream longer(fits + "x\n");
+    EXPECT_THAT(
+        [&] { Y4mReader const reader(longer, "in.y4m"); },
+        ThrowsMessage<ToolError>(HasSubstr("in.y4m has a stream header longer than 4096 bytes")));
+}
+
+TEST(Y4mReader, StopsReadingAHeaderAtTheCap) {
+    std::istringstream input("YUV4MPEG2 W2 H2 X" + std::string(1 << 20, 'x'));
+    EXPECT_THROW(Y4mReader(input, "in.y4m"), ToolError);
+    EXPECT_LE(input.tellg(), std::streampos(Y4mReader::MAX_LINE));
+}
+
+struct BadStream {
+    char const* name;
+    std::string bytes;
+    char const* reason;
+};
+
+class Y4mReaderTest : public ::testing::TestWithParam<BadStream> {};
+
+// Every refusal names the source and says what is wrong; the header's are made on construction.
+TEST_P(Y4mReaderTest, RefusesABadStreamSayingWhy) {
+    EXPECT_THAT(
+        [] {
+            std::istringstream input(GetParam().bytes);
+            Y4mReader reader(input, "in.y4m");
+            YuvImage frame;
+            while (reader.ReadFrame(frame)) {
+            }
+        },
+        ThrowsMessage<ToolError>(HasSubstr(std::string("in.y4m ") + GetParam().reason)));
+}
+
+std::string CaseName(::testing::TestParamInfo<BadStream> const& info) {
+    return info.param.name;
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Refusals, Y4mReaderTest,
+    ::testing::Values(
+        BadStream{"Empty", "", "is not a YUV4MPEG2 stream"},
+        BadStream{"OtherMagic", "YUV4MPEG W4 H2\n", "is not a YUV4MPEG2 stream"},
+        BadStream{"MagicRunOn", "YUV4MPEG2X W4 H2\n", "is not a YUV4MPEG2 stream"},
+        BadStream{"Png", std::string("\x89PNG\r\n\x1a\n\0\0\0\rIHDR", 16),
+                  "is not a YUV4MPEG2 stream"},
+        BadStream{"MagicAlone", "YUV4MPEG2", "is not a YUV4MPEG2 stream"},
+        BadStream{"HeaderCutShort", "YUV4MPEG2 W4 H2", "ends inside its stream header"},
+        BadStream{"NoTags", "YUV4MPEG2\n", "has no frame width (W) in its header"},
+        BadStream{"NoWidth", "YUV4MPEG2 H2 F25:1\n", "has no frame width (W) in its header"},
+        BadStream{"NoHeight", "YUV4MPEG2 W4 F25:1\n", "has no frame height (H) in its header"},
+        BadStream{"ZeroWidth", "YUV4MPEG2 W0 H2\n", "has a frame width that is not a whole"},
+        BadStream{"NegativeHeight", "YUV4MPEG2 W4 H-2\n", "has a frame height that is not"},
+        BadStream{"WidthBeyondTheCap", "YUV4MPEG2 W16385 H2\n",
+                  "has a frame width that is not a whole number from 1 to 16384: W16385"},
+        BadStream{"HugeHeight", "YUV4MPEG2 W4 H99999999999999999999999\n",
+                  "has a frame height that is not a whole number from 1 to 16384"},
+        BadStream{"WidthWithTail", "YUV4MPEG2 W4x H2\n", "has a frame width"},
+        BadStream{"EmptyWidth", "YUV4MPEG2 W H2\n", "has a frame width"},
+        BadStream{"Chroma422", "YUV4MPEG2 W4 H2 C422\n", "has the colour space C422; vexmap"},
+        BadStream{"Chroma444", "YUV4MPEG2 W4 H2 C444\n", "has the colour space C444"},
+        BadStream{"Mono", "YUV4MPEG2 W4 H2 Cmono\n", "has the colour space Cmono"},
+        BadStream{"TenBit", "YUV4MPEG2 W4 H2 C420p10\n", "has the colour space C420p10"},
+        BadStream{"EmptyColourSpace", "YUV4MPEG2 W4 H2 C\n", "has the colour space C;"},
+        BadStream{"RateWithoutDenominator", "YUV4MPEG2 W4 H2 F25\n", "has a frame rate"},
+        BadStream{"ZeroRate", "YUV4MPEG2 W4 H2 F0:1\n", "has a frame rate"},
+        BadStream{"RateOverZero", "YUV4MPEG2 W4 H2 F25:0\n", "has a frame rate"},
+        BadStream{"RateBeyondInt", "YUV4MPEG2 W4 H2 F4294967296:1\n", "has a frame rate"},
+        BadStream{"AspectWithoutColon", "YUV4MPEG2 W4 H2 A1\n", "has a pixel aspect"},
+        BadStream{"UnknownInterlacing", "YUV4MPEG2 W4 H2 Ix\n", "has an unknown interlacing"},
+        BadStream{"TruncatedFrame", SMALL_HEADER + "FRAME\n" + FrameBytes(11, 1),
+                  "ends inside frame 1, after 11 of its 12 bytes"},
+        BadStream{"TruncatedSecondFrame",
+                  SMALL_HEADER + "FRAME\n" + FrameBytes(12, 1) + "FRAME\n" + FrameBytes(1, 2),
+                  "ends inside frame 2, after 1 of its 12 bytes"},
+        BadStream{"FrameLineCutShort", SMALL_HEADER + "FRA",
+                  "ends inside its FRAME line of frame 1"},
+        BadStream{"FrameLineWithoutBytes", SMALL_HEADER + "FRAME\n",
+                  "ends inside frame 1, after 0 of its 12 bytes"},
+        BadStream{"NoFrameLine", SMALL_HEADER + FrameBytes(12, 1) + "\n",
+                  "has a bad FRAME line of frame 1: it does not start with FRAME"},
+        BadStream{"FrameLineRunOn", SMALL_HEADER + "FRAMES\n" + FrameBytes(12, 1),
+                  "has a bad FRAME line of frame 1"},
+        BadStream{"SecondFrameLineLowercase",
+                  SMALL_HEADER + "FRAME\n" + FrameBytes(12, 1) + "frame\n" + FrameBytes(12, 2),
+                  "has a bad FRAME line of frame 2"},
+        BadStream{"FrameLineBeyondTheCap",
+                  SMALL_HEADER + "FRAME X" + std::string(Y4mReader::MAX_LINE, 'x') + "\n",
+                  "has a FRAME line of frame 1 longer than 4096 bytes"}),
+    CaseName);
+
+// A header may promise a frame of hundreds of megabytes; a stream that ends early must not have
+// cost them.
+TEST(Y4mReader, AHugeFrameThatNeverComesCostsLittleMemory) {
+    std::istringstream input("YUV4MPEG2 W16384 H16384\nFRAME\n" + FrameBytes(100, 1));
+    Y4mReader reader(input, "in.y4m");
+    YuvImage frame;
+    EXPECT_THAT([&] { reader.ReadFrame(frame); },
+                ThrowsMessage<ToolError>(HasSubstr("ends inside frame 1, after 100 of its")));
+    EXPECT_LE(frame.bytes.capacity(), std::size_t(4) << 20);
+}
+
+TEST(Y4mReader, ReadsAFrameLargerThanOneReadStep) {
+    std::size_t const bytes = YuvImage::FrameBytes(2048, 1024);
+    std::istringstream input("YUV4MPEG2 W2048 H1024\nFRAME\n" + FrameBytes(bytes, 3));
+    Y4mReader reader(input, "in.y4m");
+    YuvImage frame;
+    ASSERT_TRUE(reader.ReadFrame(frame));
+    EXPECT_EQ(AsBytes(FrameBytes(bytes, 3)), frame.bytes);
+}
+
+}  // namespace
+}  // namespace vexmap_host
