@@ -2,6 +2,7 @@
 
 #include <cerrno>
 #include <cstddef>
+#include <limits>
 #include <memory>
 
 #include <boost/make_shared.hpp>
@@ -23,6 +24,17 @@ constexpr char const* SOURCE = "src/channel";
 [[noreturn]] void Fail(int line, char const* function, int code, char const* message) {
     Error::SetLastError(code);
     throw Error(CodeLocation(SOURCE, "Channel", function, line), code, "%s", message);
+}
+
+// Truncated to whole pixels. A size that no 64-bit count holds, from a lens of absurd angles,
+// is held at the ends of the count instead of being converted undefined: NaN and below zero
+// give 0, beyond the largest count the largest.
+std::size_t WholePixels(float size) {
+    constexpr float COUNT_LIMIT = 18446744073709551616.0f;  // 2^64
+    if (!(size > 0.0f)) {
+        return 0;
+    }
+    return size < COUNT_LIMIT ? std::size_t(size) : std::numeric_limits<std::size_t>::max();
 }
 
 }  // namespace
@@ -193,7 +205,6 @@ bool Channel::GetSettings(_DEWARP_CHANNEL_SETTINGS& settings) const {
     return true;
 }
 
-// Each side is truncated to whole pixels.
 bool Channel::GetNativeResolution(_DEWARP_RESOLUTION& resolution) const {
     ReadLock const lock(*m_pMutex);
     boost::shared_ptr<AbstractView> const view_object = GetViewObject();
@@ -202,8 +213,8 @@ bool Channel::GetNativeResolution(_DEWARP_RESOLUTION& resolution) const {
         return false;
     }
     Resolution const size = view_object->GetProjectionSize();
-    resolution.width = std::size_t(size.x);
-    resolution.height = std::size_t(size.y);
+    resolution.width = WholePixels(size.x);
+    resolution.height = WholePixels(size.y);
     return true;
 }
 

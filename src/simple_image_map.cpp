@@ -216,9 +216,12 @@ void SimpleImageMap::RemapYuv422aPacked(_DEWARP_IMAGE const& source,
             uint32_t const right = entry[3] * pitch + right_x * 2;
             bool const left_inside = left < limit && left_x < in.width;
             uint32_t const pair_start = left & ~2u;
-            target[0] = left_inside ? pixels[pair_start] : BLACK_CHROMA;
+            // A frame whose stride times height is odd ends in half a pair: its V would lie
+            // past the frame, so that pair's chroma is black.
+            bool const chroma_inside = left_inside && pair_start + 2 < limit;
+            target[0] = chroma_inside ? pixels[pair_start] : BLACK_CHROMA;
             target[1] = left_inside ? pixels[left | 1u] : BLACK_LUMA;
-            target[2] = left_inside ? pixels[pair_start + 2] : BLACK_CHROMA;
+            target[2] = chroma_inside ? pixels[pair_start + 2] : BLACK_CHROMA;
             target[3] = right < limit && right_x < in.width ? pixels[right | 1u] : BLACK_LUMA;
         }
     }
@@ -249,11 +252,14 @@ void SimpleImageMap::RemapYuv422bPacked(_DEWARP_IMAGE const& source,
             // Intended: the test is on the pair's start, not on the pixel's own offset as in
             // the U Y V Y layout.
             bool const left_inside = pair_start < limit && left_x < in.width;
+            // A frame whose stride times height is odd ends in half a pair: its V would lie
+            // past the frame, so that pair's chroma is black.
+            bool const chroma_inside = left_inside && pair_start + 3 < limit;
             // Intended: the left pixel shows the first luma of its source pair, not its own.
             target[0] = left_inside ? pixels[pair_start] : BLACK_LUMA;
-            target[1] = left_inside ? pixels[pair_start + 1] : BLACK_CHROMA;
+            target[1] = chroma_inside ? pixels[pair_start + 1] : BLACK_CHROMA;
             target[2] = right < limit && right_x < in.width ? pixels[right] : BLACK_LUMA;
-            target[3] = left_inside ? pixels[pair_start + 3] : BLACK_CHROMA;
+            target[3] = chroma_inside ? pixels[pair_start + 3] : BLACK_CHROMA;
         }
     }
 }
@@ -434,7 +440,9 @@ void SimpleImageMap::RemapNv420Planar(_DEWARP_IMAGE const& source,
             uint32_t const x = top[0];
             // Bit 0 cleared: the index lands on the U of the pair.
             uint32_t const index = ((uint32_t(top[1]) >> 1) * in.stride + x) & ~1u;
-            bool const inside = index < chroma_limit && x < in.width;
+            // The pair's V is tested too: a chroma plane of odd size ends in a lone U, and the
+            // byte after it lies past the frame.
+            bool const inside = index + 1 < chroma_limit && x < in.width;
             target[0] = inside ? chroma[index] : BLACK_CHROMA;
             target[1] = inside ? chroma[index + 1] : BLACK_CHROMA;
         }

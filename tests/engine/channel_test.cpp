@@ -5,6 +5,7 @@
 #include <cmath>
 #include <cstddef>
 #include <cstdlib>
+#include <limits>
 #include <memory>
 #include <vector>
 
@@ -424,6 +425,24 @@ TEST(Channel, GetNativeResolutionTruncatesTheViewsProjectionSize) {
     EXPECT_EQ(std::size_t(size.x), resolution.width);
     EXPECT_EQ(std::size_t(size.y), resolution.height);
     EXPECT_LT(0u, resolution.width);
+}
+
+TEST(Channel, GetNativeResolutionOfAnAbsurdLensIsHeldAtTheEndsOfTheCount) {
+    // Next to no field of view across a wide sensor: a projection far beyond any 64-bit count.
+    _DEWARP_INTERNAL_CAMERA_MODEL const absurd = {
+        DEWARP_INTERNAL_CAMERA_TYPE_CIRCULAR_FISHEYE, 94.6f, 1e-31f, 1e-31f, 3084, 500};
+    Channel channel(absurd, DEWARP_INTERNAL_CAMERA_MOUNT_WALL);
+    _DEWARP_RESOLUTION resolution{1, 1};
+    ASSERT_TRUE(channel.GetNativeResolution(resolution));
+    Resolution const size = channel.GetViewObject()->GetProjectionSize();
+    for (auto const& [side, count] : {std::pair<float, std::size_t>{size.x, resolution.width},
+                                      std::pair<float, std::size_t>{size.y, resolution.height}}) {
+        if (side >= 18446744073709551616.0f) {
+            EXPECT_EQ(std::numeric_limits<std::size_t>::max(), count);
+        } else {
+            EXPECT_EQ(std::size_t(side), count);
+        }
+    }
 }
 
 // Mount

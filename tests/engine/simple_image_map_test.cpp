@@ -228,16 +228,18 @@ void ReferencePacked(SimpleImageMap const& map, _DEWARP_IMAGE const& source,
             unsigned char* const target = destination.data + row * (out.stride * 2) + 4 * pair;
             if (!y_first) {  // U Y V Y
                 bool const inside = b < limit && left.x < in.width;
-                target[0] = inside ? source.data[m] : 128;
+                bool const chroma = inside && m + 2 < limit;  // a V past the frame is black
+                target[0] = chroma ? source.data[m] : 128;
                 target[1] = inside ? source.data[b | 1] : 16;
-                target[2] = inside ? source.data[m + 2] : 128;
+                target[2] = chroma ? source.data[m + 2] : 128;
                 target[3] = right_inside ? source.data[own | 1] : 16;
             } else {  // Y U Y V
                 bool const inside = m < limit && left.x < in.width;
+                bool const chroma = inside && m + 3 < limit;  // a V past the frame is black
                 target[0] = inside ? source.data[m] : 16;
-                target[1] = inside ? source.data[m + 1] : 128;
+                target[1] = chroma ? source.data[m + 1] : 128;
                 target[2] = right_inside ? source.data[own] : 16;
-                target[3] = inside ? source.data[m + 3] : 128;
+                target[3] = chroma ? source.data[m + 3] : 128;
             }
         }
     }
@@ -316,7 +318,7 @@ void ReferenceNv420Planar(SimpleImageMap const& map, _DEWARP_IMAGE const& source
             ReferenceLumaBlock(map, source, destination, 2 * c, 2 * r, 2);
             Entry const e = At(map, 2 * c, 2 * r);
             uint32_t const index = ((e.y >> 1) * in.stride + e.x) & ~1u;
-            bool const inside = index < (in.plane >> 1) && e.x < in.width;
+            bool const inside = index + 1 < (in.plane >> 1) && e.x < in.width;
             uint32_t const target = out.plane + r * out.stride + 2 * c;
             destination.data[target] = inside ? source.data[in.plane + index] : 128;
             destination.data[target + 1] = inside ? source.data[in.plane + index + 1] : 128;
@@ -921,8 +923,28 @@ TEST(SimpleImageMap, PackedLayoutsMakeTheirBoundTestOnDifferentOffsets) {
     EXPECT_THAT(Slice(uyvy.bytes, 0, 4), ElementsAre(128, 16, 128, 16));
     Picture const yuyv_source = Numbered(DEWARP_IMAGE_FORMAT_YUV422B_PACKED, 3, 1, 3);
     Picture const yuyv = RemapEverywhere(yuyv_source.image, 2, 2, 0, 1);
+    // The pair's start passes where the pixel's own offset fails: its luma shows. Its V would
+    // lie past the six bytes of the frame, so its chroma is black.
+    EXPECT_THAT(Slice(yuyv.bytes, 0, 4), ElementsAre(yuyv_source.bytes[4], 128, 16, 128));
+}
+
+TEST(SimpleImageMap, APackedPairCutByTheEndOfAnOddFrameHasBlackChroma) {
+    // Three pixels in one row: six bytes, the last pair holds U Y and no V.
+    Picture const uyvy_source = Numbered(DEWARP_IMAGE_FORMAT_YUV422A_PACKED, 3, 1, 3);
+    Picture const uyvy = RemapEverywhere(uyvy_source.image, 2, 2, 2, 0);  // byte 4, pair at 4
+    EXPECT_THAT(Slice(uyvy.bytes, 0, 4),
+                ElementsAre(128, uyvy_source.bytes[5], 128, uyvy_source.bytes[5]));
+    Picture const yuyv_source = Numbered(DEWARP_IMAGE_FORMAT_YUV422B_PACKED, 3, 1, 3);
+    Picture const yuyv = RemapEverywhere(yuyv_source.image, 2, 2, 2, 0);
     EXPECT_THAT(Slice(yuyv.bytes, 0, 4),
-                ElementsAre(yuyv_source.bytes[4], yuyv_source.bytes[5], 16, yuyv_source.bytes[7]));
+                ElementsAre(yuyv_source.bytes[4], 128, yuyv_source.bytes[4], 128));
+}
+
+TEST(SimpleImageMap, AnNvChromaPlaneOfOddSizeEndsInBlackRatherThanPastTheFrame) {
+    // 31 x 2: a chroma plane of 31 bytes, whose last even index has no V after it.
+    Picture const source = Numbered(DEWARP_IMAGE_FORMAT_NV420_PLANAR, 31, 2, 31);
+    Picture const destination = RemapEverywhere(source.image, 2, 2, 30, 1);
+    EXPECT_THAT(Slice(destination.bytes, 4, 2), ElementsAre(128, 128));
 }
 
 TEST(SimpleImageMap, Yuv411LowerRowsIndexWithTheXOfTheBlocksSecondRow) {
