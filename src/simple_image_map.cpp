@@ -46,6 +46,16 @@ inline unsigned char Luma(unsigned char const* plane, Frame const& in,
     return Luma(plane, in, entry, entry[0]);
 }
 
+// The four luma samples of a 2 x 2 block, from the block's two table rows.
+inline void LumaBlock(unsigned char const* plane, Frame const& in, unsigned short const* top,
+                      unsigned short const* bottom, unsigned char* top_out,
+                      unsigned char* bottom_out) {
+    top_out[0] = Luma(plane, in, top);
+    top_out[1] = Luma(plane, in, top + 2);
+    bottom_out[0] = Luma(plane, in, bottom);
+    bottom_out[1] = Luma(plane, in, bottom + 2);
+}
+
 }  // namespace
 
 SimpleImageMap::SimpleImageMap() = default;
@@ -299,10 +309,7 @@ void SimpleImageMap::RemapYuv422Planar(_DEWARP_IMAGE const& source,
         unsigned char* const bottom_v = top_v + out_chroma_stride;
         for (uint32_t column = 0; column < block_columns;
              ++column, top += 4, bottom += 4, top_out += 2, bottom_out += 2) {
-            top_out[0] = Luma(luma, in, top);
-            top_out[1] = Luma(luma, in, top + 2);
-            bottom_out[0] = Luma(luma, in, bottom);
-            bottom_out[1] = Luma(luma, in, bottom + 2);
+            LumaBlock(luma, in, top, bottom, top_out, bottom_out);
             uint32_t const top_index = (uint32_t(top[0]) >> 1) + ((top[1] * in.stride) >> 1);
             bool const top_inside = top_index < chroma_limit && top[0] < in.width;
             top_u[column] = top_inside ? u_plane[top_index] : BLACK_CHROMA;
@@ -345,10 +352,7 @@ void SimpleImageMap::RemapYuv420Planar(_DEWARP_IMAGE const& source,
         unsigned char* const v_target = v_out + block_row * out_chroma_stride;
         for (uint32_t column = 0; column < block_columns;
              ++column, top += 4, bottom += 4, top_out += 2, bottom_out += 2) {
-            top_out[0] = Luma(luma, in, top);
-            top_out[1] = Luma(luma, in, top + 2);
-            bottom_out[0] = Luma(luma, in, bottom);
-            bottom_out[1] = Luma(luma, in, bottom + 2);
+            LumaBlock(luma, in, top, bottom, top_out, bottom_out);
             uint32_t const x = top[0];
             uint32_t const index = (x >> 1) + (uint32_t(top[1]) >> 1) * chroma_stride;
             bool const inside = index < chroma_limit && x < in.width;
@@ -433,10 +437,7 @@ void SimpleImageMap::RemapNv420Planar(_DEWARP_IMAGE const& source,
         unsigned char* target = chroma_out + block_row * out.stride;
         for (uint32_t column = 0; column < block_columns;
              ++column, top += 4, bottom += 4, top_out += 2, bottom_out += 2, target += 2) {
-            top_out[0] = Luma(luma, in, top);
-            top_out[1] = Luma(luma, in, top + 2);
-            bottom_out[0] = Luma(luma, in, bottom);
-            bottom_out[1] = Luma(luma, in, bottom + 2);
+            LumaBlock(luma, in, top, bottom, top_out, bottom_out);
             uint32_t const x = top[0];
             // Bit 0 cleared: the index lands on the U of the pair.
             uint32_t const index = ((uint32_t(top[1]) >> 1) * in.stride + x) & ~1u;
