@@ -683,7 +683,7 @@ TEST_F(ImmervisionDewarperTest, SubModeZeroMeansOneAndTheSameSubModeChangesNothi
     EXPECT_EQ((Names{"Update"}), imv1_standin::CallNames());
 }
 
-TEST_F(ImmervisionDewarperTest, APanoramaStartsClearedWithPanAtThePanoramaOffset) {
+TEST_F(ImmervisionDewarperTest, SetSubModeTwoWithAPanoramaOffsetOf45ClearsAndGivesPan45) {
     Create(Camera(CEILING, -1, 45));
     dewarper->SetPosition(10.0f, 30.0f, 60.0f);
     dewarper->SetSubMode(2);
