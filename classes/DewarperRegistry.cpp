@@ -2,10 +2,50 @@
 
 #include <cstring>
 #include <new>
+#include <type_traits>
 
 #include "BrenviaDewarper.h"
 #include "CameraTable.h"
+#include "GeoFisheyeLibrary.h"
+#include "GeovisionDewarper.h"
+#include "ImmervisionDewarper.h"
+#include "ImmervisionLibrary.h"
 #include "Sentry360Dewarper.h"
+#include "VivotekDewarper.h"
+#include "VivotekLibrary.h"
+
+namespace {
+
+// The vendors' Linux libraries are x86-64 builds against glibc, which needs a kernel of 3.2 or
+// later; below that their libraries cannot exist, and the kinds that need them are not offered.
+constexpr OperatingSystemVersion IMMERVISION_MINIMUM = {3, 2};
+constexpr OperatingSystemVersion VIVOTEK_MINIMUM = {3, 2};
+
+// What a kind opens before its first dewarper: nothing for the kinds whose code is all in the
+// plug-in, the vendor's library for the others.
+template <typename T>
+struct KindLibrary {
+    static bool Acquire() { return true; }
+    static void Release() {}
+};
+
+template <typename Functions, VendorLibrary<Functions>& library>
+struct VendorKindLibrary {
+    static bool Acquire() { return library.Acquire(); }
+    static void Release() { library.Release(); }
+};
+
+template <>
+struct KindLibrary<ImmervisionDewarper>
+    : VendorKindLibrary<ImmervisionFunctions, ImmervisionLibraryInstance> {};
+template <>
+struct KindLibrary<VivotekDewarper> : VendorKindLibrary<VivotekFunctions, VivotekLibraryInstance> {
+};
+template <>
+struct KindLibrary<GeovisionDewarper>
+    : VendorKindLibrary<GeoFisheyeFunctions, GeoFisheyeLibraryInstance> {};
+
+}  // namespace
 
 DewarperRegistry DewarperRegistryInstance;
 
@@ -34,11 +74,39 @@ void DewarperRegistry::Register(char const* dll, char const* name, bool hasPosit
         IDewarper* Create(DewarpParams_t const& params) override {
             return new (std::nothrow) T(params);
         }
-        // Nothing is opened here: the kind's code is linked in.
-        bool DelayLoad() override { return true; }
-        void DelayUnload() override {}
-        void ForceUnload() override {}
-        int GetDefaultLens(int, char const*, char const*) override { return 0; }
+        // A vendor kind opens its library here, on demand, and holds one reference to it until
+        // unloaded (see VendorLibrary): without the library the kind is listed but not loaded,
+        // and no dewarper of it is made.
+        bool DelayLoad() override {
+            if (!holdsLibrary) {
+                holdsLibrary = KindLibrary<T>::Acquire();
+            }
+            return holdsLibrary;
+        }
+        void DelayUnload() override { ReleaseLibrary(); }
+        void ForceUnload() override { ReleaseLibrary(); }
+        int GetDefaultLens(int mode, char const* make, char const* model) override {
+            if constexpr (std::is_same_v<T, ImmervisionDewarper>) {
+                // The default is found in the library's lens list, so a host that asks before
+                // it asked whether the kind is loaded gets the library opened here.
+                if (!DelayLoad()) {
+                    return 0;
+                }
+                return ImmervisionDewarper::GetDefaultLens(mode, make, model);
+            } else {
+                return 0;
+            }
+        }
+
+    private:
+        void ReleaseLibrary() {
+            if (holdsLibrary) {
+                KindLibrary<T>::Release();
+                holdsLibrary = false;
+            }
+        }
+
+        bool holdsLibrary = false;
     };
     DewarpInfo* const info = new DewarpInfoT;
     info->dll = dll;
@@ -51,9 +119,26 @@ void DewarperRegistry::Register(char const* dll, char const* name, bool hasPosit
     kinds[type] = info;
 }
 
-DewarperRegistry::DewarperRegistry() {
+DewarperRegistry::DewarperRegistry() : DewarperRegistry(OperatingSystemVersion::Running) {}
+
+// The version is read once for each gate, as the gates are independent.
+DewarperRegistry::DewarperRegistry(OperatingSystemVersion (*readVersion)()) {
     Register<Sentry360Dewarper>("360API.dll", "Sentry360", true, false, true, true,
                                 DewarperType::DewarperSentry360);
+    OperatingSystemVersion version = readVersion();
+    if (version.AtLeast(IMMERVISION_MINIMUM.major, IMMERVISION_MINIMUM.minor)) {
+        Register<ImmervisionDewarper>("IMV1.dll", "ImmerVision", true, true, false, false,
+                                      DewarperType::DewarperImmervision);
+        Register<ImmervisionDewarper>("IMV1.dll", "Samsung", true, true, false, true,
+                                      DewarperType::DewarperSamsung);
+    }
+    version = readVersion();
+    if (version.AtLeast(VIVOTEK_MINIMUM.major, VIVOTEK_MINIMUM.minor)) {
+        Register<VivotekDewarper>("fisheyesw.dll", "Vivotek", true, true, false, true,
+                                  DewarperType::DewarperVivotek);
+    }
+    Register<GeovisionDewarper>("GeoFESDK.dll", "Geovision", true, false, false, true,
+                                DewarperType::DewarperGeovision);
     Register<BrenviaDewarper>(nullptr, "Brenvia", true, false, false, true,
                               DewarperType::DewarperBrenvia);
 }

@@ -3,6 +3,7 @@
 #include <map>
 
 #include "DewarpWrapper.h"
+#include "OperatingSystemVersion.h"
 
 /// The fixed set of dewarper kinds, registered once when the library is loaded. Owns one record per
 /// kind and the hidden dewarpers made to answer `GetLens`. The kinds never change after
@@ -36,7 +37,10 @@ public:
     /// The number of modes the host may ask about, registered or not.
     static constexpr int MODE_COUNT = 17;
 
+    /// Registers the kinds that the running system can serve.
     DewarperRegistry();
+    /// Registers the kinds that a system of the version `readVersion` tells can serve.
+    explicit DewarperRegistry(OperatingSystemVersion (*readVersion)());
     DewarperRegistry(DewarperRegistry const&) = delete;  // owns its records and dewarpers
     DewarperRegistry& operator=(DewarperRegistry const&) = delete;
     ~DewarperRegistry() override;

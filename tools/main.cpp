@@ -53,6 +53,8 @@ struct Options {
     std::optional<std::string> model;
     std::optional<std::string> url;
     std::optional<int> sub_mode;
+    std::optional<int> lens;
+    bool list = false;
     int position = 1;
     std::optional<Circle> circle;
     RequestedPosition ptz;
@@ -173,7 +175,7 @@ Choice ChooseMode(PluginHost const& host, Options const& options) {
     }
     if (!host.DewarperLoaded(choice.mode)) {
         throw ToolError(std::string("the ") + registry.GetName(choice.mode) +
-                        " dewarper is not loaded");
+                        " dewarper is not available: its vendor library is not installed");
     }
     return choice;
 }
@@ -285,8 +287,44 @@ StreamRun WriteStream(Options const& options, DewarpSession const& session, int 
     return run;
 }
 
+// The name of lens `lens` of a kind, or "" past the end of its list.
+std::string LensName(DewarpRegister& registry, int mode, int lens) {
+    char name[256] = {};
+    return registry.GetLens(mode, lens, name, sizeof name) > 0 ? name : "";
+}
+
+// Every kind the plug-in registers, as a client lists them: mode, name, whether it can be used
+// here, and the lenses of a usable kind that has them.
+void ListKinds(PluginHost const& host) {
+    DewarpRegister& registry = host.Register();
+    for (int mode = 0; mode < registry.GetModeCount(); ++mode) {
+        std::string const name = registry.GetName(mode);
+        if (name.empty()) {
+            continue;
+        }
+        bool const loaded = host.DewarperLoaded(mode);
+        printf("%2d %-12s %s\n", mode, name.c_str(),
+               loaded ? "available" : "not available (vendor library not installed)");
+        bool has_lenses = false;
+        bool has_circle = false;
+        bool has_position = false;
+        registry.GetSupportedFeatures(mode, has_lenses, has_circle, has_position);
+        for (int lens = 0; loaded && has_lenses; ++lens) {
+            std::string const lens_name = LensName(registry, mode, lens);
+            if (lens_name.empty()) {
+                break;
+            }
+            printf("     lens %d: %s\n", lens, lens_name.c_str());
+        }
+    }
+}
+
 int Run(Options const& options) {
     PluginHost const host(options.plugin.empty() ? DefaultPluginPath() : options.plugin);
+    if (options.list) {
+        ListKinds(host);
+        return 0;
+    }
     Source source;
     Circle circle;
     Open(options, source, circle);
@@ -304,6 +342,11 @@ int Run(Options const& options) {
     bool has_position = false;
     registry.GetSupportedFeatures(mode, has_lenses, has_circle, has_position);
     DewarpParams params{};
+    if (has_lenses) {
+        // As a client does: the camera's default lens unless the user picked one.
+        params.lens = options.lens.value_or(registry.GetDefaultLens(
+            mode, options.make.value_or("").c_str(), options.model.value_or("").c_str()));
+    }
     if (has_position) {
         params.position = options.position;
     }
@@ -351,6 +394,10 @@ int Run(Options const& options) {
     // Printed once only rendering and writing can fail, so that a refusal leaves stdout empty.
     if (info != nullptr) {
         fprintf(info, "%s dewarper (mode %d), chosen %s\n", kind.c_str(), mode, choice.how.c_str());
+        if (has_lenses) {
+            fprintf(info, "%s lens %d: %s\n", kind.c_str(), params.lens,
+                    LensName(registry, mode, params.lens).c_str());
+        }
     }
     for (int const sub_mode : sub_modes) {
         RgbImage const view = session.Render(sub_mode, options.ptz, source.picture, options.width,
@@ -390,6 +437,13 @@ void AddOptions(CLI::App& app, Options& options) {
            "view kind: 1 PTZ, 2 panorama, 3 dual panorama (default: every supported one; PTZ "
            "for a stream)")
         ->check(CLI::Range(1, 3));
+    app.add_option("--lens", options.lens,
+                   "lens number of a kind that has a lens list (see --list; default: the "
+                   "camera's own, else 0)")
+        ->check(CLI::NonNegativeNumber);
+    app.add_flag("--list", options.list,
+                 "list the dewarper kinds of the plug-in, whether each is available here, and "
+                 "their lenses");
     app.add_option("--position", options.position, "camera mount: wall, ceiling or floor")
         ->transform(CLI::CheckedTransformer(
             std::map<std::string, int>{{"wall", 0}, {"ceiling", 1}, {"floor", 2}}))

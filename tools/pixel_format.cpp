@@ -40,7 +40,7 @@ void RequireWhole(YuvImage const& image) {
 }  // namespace
 
 PixelFormat::PixelFormat(int frame_format) : format(frame_format) {
-    if (format != I420 && format != RGB24) {
+    if (format != I420 && format != RGB24 && format != RGBX32 && format != PLANAR_420) {
         throw ToolError("the tool cannot convert pixel format " + std::to_string(format));
     }
 }
@@ -50,13 +50,13 @@ std::size_t PixelFormat::FrameBytes(int width, int height) const {
         return 0;
     }
     std::size_t const pixels = std::size_t(width) * std::size_t(height);
-    return format == I420 ? pixels * 3 / 2 : pixels * 3;
+    return IsPlanar420() ? pixels * 3 / 2 : pixels * BytesPerRgbPixel();
 }
 
 // An odd side has no place in the plug-in's 4:2:0 frame: its chroma rows are half the luma row
 // rounded down, which would drop or misplace the chroma of the last column.
 void PixelFormat::RequireSize(int width, int height, std::size_t size) const {
-    if (format == I420 && (width % 2 != 0 || height % 2 != 0)) {
+    if (IsPlanar420() && (width % 2 != 0 || height % 2 != 0)) {
         throw ToolError("4:2:0 frames of the plug-in need an even width and height, not " +
                         SizeText(width, height));
     }
@@ -69,7 +69,7 @@ void PixelFormat::RequireSize(int width, int height, std::size_t size) const {
 }
 
 void PixelFormat::Encode(RgbImage const& image, unsigned char* buffer, std::size_t size) const {
-    if (format == I420) {
+    if (IsPlanar420()) {
         Store(ToYuv(image), buffer, size);
     } else {
         Store(image, buffer, size);
@@ -77,7 +77,7 @@ void PixelFormat::Encode(RgbImage const& image, unsigned char* buffer, std::size
 }
 
 void PixelFormat::Encode(YuvImage const& image, unsigned char* buffer, std::size_t size) const {
-    if (format == I420) {
+    if (IsPlanar420()) {
         Store(image, buffer, size);
     } else {
         Store(ToRgb(image), buffer, size);
@@ -87,30 +87,47 @@ void PixelFormat::Encode(YuvImage const& image, unsigned char* buffer, std::size
 RgbImage PixelFormat::Decode(int width, int height, unsigned char const* buffer,
                              std::size_t size) const {
     RequireSize(width, height, size);
-    if (format == I420) {
+    if (IsPlanar420()) {
         YuvImage const image{width, height, std::vector<uint8_t>(buffer, buffer + size)};
         return ToRgb(image);
     }
-    return RgbImage{width, height, std::vector<uint8_t>(buffer, buffer + size)};
+    return Unpack(width, height, buffer);
+}
+
+RgbImage PixelFormat::Unpack(int width, int height, unsigned char const* buffer) const {
+    std::size_t const pixels = std::size_t(width) * std::size_t(height);
+    std::size_t const stride = BytesPerRgbPixel();
+    RgbImage image{width, height, std::vector<uint8_t>(pixels * 3)};
+    for (std::size_t pixel = 0; pixel < pixels; ++pixel) {
+        std::copy_n(buffer + pixel * stride, 3, &image.pixels[pixel * 3]);
+    }
+    return image;
 }
 
 YuvImage PixelFormat::DecodeYuv(int width, int height, unsigned char const* buffer,
                                 std::size_t size) const {
     RequireSize(width, height, size);
-    if (format == I420) {
+    if (IsPlanar420()) {
         return YuvImage{width, height, std::vector<uint8_t>(buffer, buffer + size)};
     }
-    RgbImage const image{width, height, std::vector<uint8_t>(buffer, buffer + size)};
-    return ToYuv(image);
+    return ToYuv(Unpack(width, height, buffer));
 }
 
 void PixelFormat::Store(RgbImage const& image, unsigned char* buffer, std::size_t size) const {
     RequireSize(image.width, image.height, size);
-    if (image.pixels.size() != size) {
+    std::size_t const pixels = size / BytesPerRgbPixel();
+    if (image.pixels.size() != pixels * 3) {
         throw ToolError("the picture holds " + std::to_string(image.pixels.size()) +
-                        " bytes, not the " + std::to_string(size) + " of its size");
+                        " bytes, not the " + std::to_string(pixels * 3) + " of its size");
     }
-    std::copy(image.pixels.begin(), image.pixels.end(), buffer);
+    if (format == RGB24) {
+        std::copy(image.pixels.begin(), image.pixels.end(), buffer);
+        return;
+    }
+    for (std::size_t pixel = 0; pixel < pixels; ++pixel) {
+        std::copy_n(&image.pixels[pixel * 3], 3, buffer + pixel * 4);
+        buffer[pixel * 4 + 3] = 255;
+    }
 }
 
 void PixelFormat::Store(YuvImage const& image, unsigned char* buffer, std::size_t size) const {

@@ -8,12 +8,15 @@
 namespace vexmap_host {
 
 /// The frame formats of the plug-in as this host decodes them. Format 3 is 24-bit RGB in the order
-/// of the file; format 0 is planar 4:2:0 (luma, then U, then V) with BT.601 limited-range values,
-/// and takes only even sizes. A format the tool does not know is refused with a ToolError.
+/// of the file, and format 6 the same with a fourth, padding byte (written 255, ignored when read);
+/// formats 0 and 23 are both planar 4:2:0 (luma, then U, then V) with BT.601 limited-range values,
+/// and take only even sizes. A format the tool does not know is refused with a ToolError.
 class PixelFormat {
 public:
     static constexpr int I420 = 0;
     static constexpr int RGB24 = 3;
+    static constexpr int RGBX32 = 6;
+    static constexpr int PLANAR_420 = 23;
 
     explicit PixelFormat(int format);  // throws ToolError for a format the tool cannot convert
     PixelFormat(PixelFormat const&) = default;
@@ -36,10 +39,14 @@ public:
     static RgbImage ToRgb(YuvImage const& image);
 
 private:
+    bool IsPlanar420() const { return format == I420 || format == PLANAR_420; }
+    std::size_t BytesPerRgbPixel() const { return format == RGBX32 ? 4 : 3; }
     void RequireSize(int width, int height, std::size_t size) const;
-    /// Copies a picture already in this format into a frame buffer.
+    /// Copies a picture into a frame buffer of its own kind, padding each pixel for format 6.
     void Store(RgbImage const& image, unsigned char* buffer, std::size_t size) const;
     void Store(YuvImage const& image, unsigned char* buffer, std::size_t size) const;
+    /// A whole frame of format 3 or 6, whose size has been checked, as 24-bit RGB.
+    RgbImage Unpack(int width, int height, unsigned char const* buffer) const;
 
     int format;
 };

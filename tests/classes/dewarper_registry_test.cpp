@@ -1,4 +1,6 @@
+#include <algorithm>
 #include <memory>
+#include <vector>
 
 #include <gtest/gtest.h>
 
@@ -128,6 +130,191 @@ TEST(DewarperRegistry, CreateMemberBuildsWithoutTheDelayedLoad) {
 
 TEST(DewarperRegistry, DeleteDewarperOfNullDoesNothing) {
     DeleteDewarper(nullptr);
+}
+
+// The kernel versions a test registry is told, one a read.
+std::vector<OperatingSystemVersion> toldVersions;
+int versionReads = 0;
+
+OperatingSystemVersion ToldVersion() {
+    OperatingSystemVersion const version = toldVersions.at(std::size_t(versionReads));
+    ++versionReads;
+    return version;
+}
+
+std::unique_ptr<DewarperRegistry> RegistryOnVersions(
+    std::vector<OperatingSystemVersion> const& versions) {
+    toldVersions = versions;
+    versionReads = 0;
+    return std::make_unique<DewarperRegistry>(ToldVersion);
+}
+
+std::vector<int> RegisteredModes(DewarperRegistry& registry) {
+    std::vector<int> modes;
+    for (int mode = 0; mode < registry.GetModeCount(); ++mode) {
+        if (*registry.GetName(mode) != '\0') {
+            modes.push_back(mode);
+        }
+    }
+    return modes;
+}
+
+TEST(DewarperRegistry, ARecentKernelRegistersAllSixKinds) {
+    auto const registry = RegistryOnVersions({{3, 2}, {3, 2}});
+    EXPECT_EQ((std::vector<int>{1, 2, 3, 7, 8, 9}), RegisteredModes(*registry));
+    EXPECT_EQ(2, versionReads);
+}
+
+TEST(DewarperRegistry, TheRunningKernelRegistersAllSixKinds) {
+    DewarperRegistry registry;
+    EXPECT_EQ((std::vector<int>{1, 2, 3, 7, 8, 9}), RegisteredModes(registry));
+}
+
+TEST(DewarperRegistry, AKernelBelowTheGateRegistersNeitherImmerVisionNorSamsungNorVivotek) {
+    auto const registry = RegistryOnVersions({{3, 1}, {3, 1}});
+    EXPECT_EQ((std::vector<int>{2, 8, 9}), RegisteredModes(*registry));
+}
+
+TEST(DewarperRegistry, AnUnreadableVersionPassesNoGate) {
+    auto const registry = RegistryOnVersions({{0, 0}, {0, 0}});
+    EXPECT_EQ((std::vector<int>{2, 8, 9}), RegisteredModes(*registry));
+    EXPECT_EQ(0, registry->GetModeByName("Vivotek"));
+    EXPECT_EQ(9, registry->GetModeByName("Geovision"));
+}
+
+TEST(DewarperRegistry, EachGateReadsTheVersionAgain) {
+    auto const immervision_only = RegistryOnVersions({{3, 2}, {2, 6}});
+    EXPECT_EQ((std::vector<int>{1, 2, 7, 8, 9}), RegisteredModes(*immervision_only));
+    auto const vivotek_only = RegistryOnVersions({{2, 6}, {4, 0}});
+    EXPECT_EQ((std::vector<int>{2, 3, 8, 9}), RegisteredModes(*vivotek_only));
+}
+
+struct KindRow {
+    int mode;
+    char const* name;
+    bool hasLenses;
+    bool hasCircle;
+    bool hasPosition;
+    bool cameraSpecific;
+};
+
+class RegisteredKindTest : public ::testing::TestWithParam<KindRow> {};
+
+TEST_P(RegisteredKindTest, HasItsNameAndFlags) {
+    KindRow const row = GetParam();
+    DewarperRegistry registry;
+    EXPECT_STREQ(row.name, registry.GetName(row.mode));
+    EXPECT_EQ(row.mode, registry.GetModeByName(row.name));
+    bool has_lenses = !row.hasLenses;
+    bool has_circle = !row.hasCircle;
+    bool has_position = !row.hasPosition;
+    registry.GetSupportedFeatures(row.mode, has_lenses, has_circle, has_position);
+    EXPECT_EQ(row.hasLenses, has_lenses);
+    EXPECT_EQ(row.hasCircle, has_circle);
+    EXPECT_EQ(row.hasPosition, has_position);
+    EXPECT_EQ(row.cameraSpecific, registry.IsCameraSpecific(row.mode));
+}
+
+INSTANTIATE_TEST_SUITE_P(Kinds, RegisteredKindTest,
+                         ::testing::Values(KindRow{2, "Sentry360", false, true, true, true},
+                                           KindRow{1, "ImmerVision", true, false, true, false},
+                                           KindRow{7, "Samsung", true, false, true, true},
+                                           KindRow{3, "Vivotek", true, false, true, true},
+                                           KindRow{9, "Geovision", false, false, true, true},
+                                           KindRow{8, "Brenvia", false, false, true, true}));
+
+TEST(DewarperRegistry, GetModeByNameOfSamsungIsSevenAndOfItsLowerCaseZero) {
+    DewarperRegistry registry;
+    EXPECT_EQ(7, registry.GetModeByName("Samsung"));
+    EXPECT_EQ(0, registry.GetModeByName("samsung"));
+    EXPECT_EQ(0, registry.GetModeByName("immervision"));
+}
+
+// This binary does not link the vendors' libraries, and none is on the loader's search path.
+class VendorKindWithoutLibraryTest : public ::testing::TestWithParam<int> {};
+
+TEST_P(VendorKindWithoutLibraryTest, IsListedButNotLoaded) {
+    int const mode = GetParam();
+    DewarperRegistry registry;
+    EXPECT_STRNE("", registry.GetName(mode));
+    EXPECT_FALSE(registry.IsLoaded(mode));
+    EXPECT_FALSE(registry.IsLoaded(mode));
+    EXPECT_FALSE(DewarperLoaded(mode));
+}
+
+TEST_P(VendorKindWithoutLibraryTest, CreateDewarperGivesNull) {
+    DewarpParams_t const params;
+    EXPECT_EQ(nullptr, CreateDewarper(GetParam(), params));
+    EXPECT_EQ(nullptr, DewarperRegistryInstance.LoadAndCreate(GetParam(), params));
+}
+
+TEST_P(VendorKindWithoutLibraryTest, ADewarperMadeWithoutTheLoadNeverReachesTheLibrary) {
+    int const mode = GetParam();
+    DewarperRegistry registry;
+    DewarpParams_t const params;
+    DewarperPointer const dewarper(
+        registry.Create(static_cast<DewarperType::DewarperTypes>(mode), params));
+    ASSERT_NE(nullptr, dewarper);
+    EXPECT_FALSE(dewarper->Check());
+    unsigned char* buffer = nullptr;
+    unsigned int size = 0;
+    int format = -1;
+    EXPECT_FALSE(dewarper->GetImageInputBuffer(64, 64, &buffer, &size, &format));
+    int width = 64;
+    int height = 64;
+    EXPECT_FALSE(dewarper->GetImageOutputBuffer(&width, &height, &buffer, &size, &format));
+    EXPECT_EQ(nullptr, buffer);
+    dewarper->SetPosition(10, 10, 10);
+    dewarper->SetSubMode(2);
+}
+
+INSTANTIATE_TEST_SUITE_P(Modes, VendorKindWithoutLibraryTest, ::testing::Values(1, 3, 7, 9));
+
+TEST(DewarperRegistry, LensKindsWithoutTheirLibraryListNoLensAndTryAgainNextTime) {
+    DewarperRegistry registry;
+    char buffer[8] = "intact";
+    for (int mode : {1, 3, 7}) {
+        EXPECT_EQ(0, registry.GetLens(mode, 0, buffer, sizeof buffer));
+        EXPECT_EQ(0, registry.GetLens(mode, 0, buffer, sizeof buffer));
+    }
+    EXPECT_STREQ("intact", buffer);
+}
+
+TEST(DewarperRegistry, GetLensOfGeovisionGivesZeroAtOnce) {
+    DewarperRegistry registry;
+    char buffer[8] = "intact";
+    EXPECT_EQ(0, registry.GetLens(9, 0, buffer, sizeof buffer));
+    EXPECT_STREQ("intact", buffer);
+}
+
+TEST(DewarperRegistry, WithoutItsLibrarySamsungHasNoDefaultLens) {
+    DewarperRegistry registry;
+    EXPECT_EQ(0, registry.GetDefaultLens(7, "Samsung", "SNF-7010"));
+    EXPECT_EQ(0, registry.GetDefaultLens(3, "Vivotek", "FE8172"));
+    EXPECT_EQ(0, registry.GetDefaultLens(9, "Geovision", "GV-FER5700"));
+}
+
+TEST(DewarperRegistry, TheInHouseKindsStillWorkWithoutAnyVendorLibrary) {
+    DewarpParams_t params;
+    params.circleX = 32;
+    params.circleY = 32;
+    params.circleRadius = 32;
+    for (int mode : {2, 8}) {
+        EXPECT_TRUE(DewarperLoaded(mode));
+        DewarperPointer const dewarper(CreateDewarper(mode, params));
+        ASSERT_NE(nullptr, dewarper);
+        unsigned char* input = nullptr;
+        unsigned int size = 0;
+        int format = 0;
+        ASSERT_TRUE(dewarper->GetImageInputBuffer(64, 64, &input, &size, &format));
+        std::fill_n(input, size, 128);
+        int width = 64;
+        int height = 48;
+        unsigned char* output = nullptr;
+        EXPECT_TRUE(dewarper->GetImageOutputBuffer(&width, &height, &output, &size, &format))
+            << "mode " << mode;
+        EXPECT_NE(nullptr, output);
+    }
 }
 
 }  // namespace

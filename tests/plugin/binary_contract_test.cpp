@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include "host_side_interfaces.h"
+#include "plugin_library.h"
 
 namespace {
 
@@ -14,29 +15,8 @@ using host_side::Registry;
 
 constexpr int SENTRY360 = 2;
 
-// The plug-in opened as a client opens it, with its four exports resolved by name.
-class BinaryContractTest : public ::testing::Test {
+class BinaryContractTest : public PluginLibraryTest {
 protected:
-    void SetUp() override {
-        library = dlopen(VEXMAP_PLUGIN_PATH, RTLD_NOW | RTLD_LOCAL);
-        ASSERT_NE(nullptr, library) << dlerror();
-        getRegister = reinterpret_cast<Registry* (*)()>(dlsym(library, "GetRegister"));
-        createDewarper = reinterpret_cast<Dewarper* (*)(int, CameraRecord const&)>(
-            dlsym(library, "CreateDewarper"));
-        dewarperLoaded = reinterpret_cast<bool (*)(int)>(dlsym(library, "DewarperLoaded"));
-        deleteDewarper = reinterpret_cast<void (*)(Dewarper*)>(dlsym(library, "DeleteDewarper"));
-        ASSERT_NE(nullptr, getRegister);
-        ASSERT_NE(nullptr, createDewarper);
-        ASSERT_NE(nullptr, dewarperLoaded);
-        ASSERT_NE(nullptr, deleteDewarper);
-    }
-
-    void TearDown() override {
-        if (library != nullptr) {
-            dlclose(library);
-        }
-    }
-
     Dewarper* CreateSentry360() {
         CameraRecord record{};
         record.position = 1;
@@ -45,12 +25,6 @@ protected:
         record.circleRadius = 32;
         return createDewarper(SENTRY360, record);
     }
-
-    void* library = nullptr;
-    Registry* (*getRegister)() = nullptr;
-    Dewarper* (*createDewarper)(int, CameraRecord const&) = nullptr;
-    bool (*dewarperLoaded)(int) = nullptr;
-    void (*deleteDewarper)(Dewarper*) = nullptr;
 };
 
 TEST_F(BinaryContractTest, ExportsAreFoundByTheirPlainNames) {
@@ -168,6 +142,25 @@ TEST_F(BinaryContractTest, AFrameGoesInAndComesOutDewarped) {
     EXPECT_EQ(22, height);
     EXPECT_EQ(48u * 22u * 3u, size);
     EXPECT_EQ(180, output[(11 * 48 + 24) * 3]);
+    deleteDewarper(dewarper);
+}
+
+// This binary's ctest runs with no vendor library on the loader's search path.
+TEST_F(BinaryContractTest, WithoutTheirLibrariesTheVendorKindsAreListedButNotLoaded) {
+    Registry* registry = getRegister();
+    CameraRecord const record{};
+    for (int mode : {1, 3, 7, 9}) {
+        EXPECT_STRNE("", registry->GetName(mode)) << mode;
+        EXPECT_FALSE(dewarperLoaded(mode)) << mode;
+        EXPECT_FALSE(registry->IsLoaded(mode)) << mode;
+        EXPECT_EQ(nullptr, createDewarper(mode, record)) << mode;
+    }
+    EXPECT_EQ(7, registry->GetModeByName("Samsung"));
+    EXPECT_TRUE(dewarperLoaded(SENTRY360));
+    EXPECT_TRUE(dewarperLoaded(8));
+    Dewarper* dewarper = CreateSentry360();
+    ASSERT_NE(nullptr, dewarper);
+    EXPECT_TRUE(dewarper->Check());
     deleteDewarper(dewarper);
 }
 

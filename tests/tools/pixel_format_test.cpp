@@ -313,6 +313,64 @@ TEST(PixelFormat, RefusesAYuvPictureWhoseBytesDoNotFitItsSize) {
                 ThrowsMessage<ToolError>(HasSubstr("the 4x2 picture holds 11 bytes")));
 }
 
+TEST(PixelFormat, Rgbx32IsFormatSixWithFourBytesAPixel) {
+    EXPECT_EQ(6, PixelFormat::RGBX32);
+    EXPECT_EQ(48u, PixelFormat(PixelFormat::RGBX32).FrameBytes(4, 3));
+}
+
+TEST(PixelFormat, Rgbx32EncodePadsEachPixelWithAnOpaqueFourthByte) {
+    RgbImage const image = NumberedPixels(2, 1);
+    std::vector<unsigned char> buffer(8, 0xEE);
+    PixelFormat(PixelFormat::RGBX32).Encode(image, buffer.data(), buffer.size());
+    EXPECT_EQ((std::vector<unsigned char>{0, 1, 2, 255, 3, 4, 5, 255}), buffer);
+}
+
+TEST(PixelFormat, Rgbx32DecodeDropsTheFourthByte) {
+    std::vector<unsigned char> const buffer = {10, 20, 30, 0, 40, 50, 60, 7};
+    RgbImage const image = PixelFormat(PixelFormat::RGBX32).Decode(2, 1, buffer.data(), 8);
+    EXPECT_EQ(2, image.width);
+    EXPECT_EQ(1, image.height);
+    EXPECT_EQ((std::vector<uint8_t>{10, 20, 30, 40, 50, 60}), image.pixels);
+}
+
+TEST(PixelFormat, Rgbx32RefusesABufferOfThreeBytesAPixel) {
+    RgbImage const image = NumberedPixels(4, 3);
+    std::vector<unsigned char> buffer(36, 0xEE);
+    EXPECT_THAT(
+        [&] { PixelFormat(PixelFormat::RGBX32).Encode(image, buffer.data(), 36); },
+        ThrowsMessage<ToolError>(HasSubstr("a 4x3 frame of format 6 takes 48 bytes, the plug-in "
+                                           "gave 36")));
+}
+
+TEST(PixelFormat, Rgbx32ConvertsAYuvPictureBothWays) {
+    PixelFormat const format(PixelFormat::RGBX32);
+    YuvImage const yuv = PixelFormat::ToYuv(NumberedPixels(4, 2));
+    std::vector<unsigned char> buffer(format.FrameBytes(4, 2));
+    format.Encode(yuv, buffer.data(), buffer.size());
+    EXPECT_EQ(PixelFormat::ToRgb(yuv).pixels, format.Decode(4, 2, buffer.data(), 32).pixels);
+    EXPECT_EQ(yuv.bytes, format.DecodeYuv(4, 2, buffer.data(), 32).bytes);
+}
+
+TEST(PixelFormat, Format23IsPlanar420LikeFormatZero) {
+    PixelFormat const format(PixelFormat::PLANAR_420);
+    EXPECT_EQ(23, PixelFormat::PLANAR_420);
+    EXPECT_EQ(PixelFormat(PixelFormat::I420).FrameBytes(6, 4), format.FrameBytes(6, 4));
+    YuvImage const yuv = PixelFormat::ToYuv(NumberedPixels(6, 4));
+    std::vector<unsigned char> buffer(format.FrameBytes(6, 4));
+    format.Encode(yuv, buffer.data(), buffer.size());
+    EXPECT_EQ(yuv.bytes, std::vector<uint8_t>(buffer.begin(), buffer.end()));
+    EXPECT_EQ(yuv.bytes, format.DecodeYuv(6, 4, buffer.data(), buffer.size()).bytes);
+}
+
+TEST(PixelFormat, Format23RefusesAnOddSide) {
+    EXPECT_THAT(
+        [&] {
+            std::vector<unsigned char> buffer(22);
+            PixelFormat(PixelFormat::PLANAR_420).Decode(5, 3, buffer.data(), buffer.size());
+        },
+        ThrowsMessage<ToolError>(HasSubstr("need an even width and height, not 5x3")));
+}
+
 class PixelFormatTest : public ::testing::TestWithParam<int> {};
 
 TEST_P(PixelFormatTest, RefusesAFormatItCannotConvertNamingIt) {
@@ -322,7 +380,7 @@ TEST_P(PixelFormatTest, RefusesAFormatItCannotConvertNamingIt) {
                     HasSubstr("the tool cannot convert pixel format " + std::to_string(unknown))));
 }
 
-INSTANTIATE_TEST_SUITE_P(UnknownFormats, PixelFormatTest, ::testing::Values(1, 6, 23, -1));
+INSTANTIATE_TEST_SUITE_P(UnknownFormats, PixelFormatTest, ::testing::Values(1, 2, 7, 22, 24, -1));
 
 }  // namespace
 }  // namespace vexmap_host

@@ -132,17 +132,28 @@ std::array<uint8_t, 3> MiddleOf(YuvImage const& image) {
             image.bytes[width * height + chroma_size + chroma]};
 }
 
-// Starts the built tool with its standard streams as the actions say; -1 if it cannot start.
+// Starts the built tool with its standard streams as the actions say, in the test's environment
+// with `added_environment` ("NAME=value" entries) in front; -1 if it cannot start.
 pid_t Start(std::vector<std::string> arguments, posix_spawn_file_actions_t const& actions,
-            posix_spawnattr_t const* attributes = nullptr) {
+            posix_spawnattr_t const* attributes = nullptr,
+            std::vector<std::string> added_environment = {}) {
     arguments.insert(arguments.begin(), VEXMAP_TOOL_PATH);
     std::vector<char*> argv;
     for (std::string& argument : arguments) {
         argv.push_back(argument.data());
     }
     argv.push_back(nullptr);
+    std::vector<char*> envp;
+    for (std::string& entry : added_environment) {
+        envp.push_back(entry.data());
+    }
+    for (char** entry = environ; *entry != nullptr; ++entry) {
+        envp.push_back(*entry);
+    }
+    envp.push_back(nullptr);
     pid_t child = 0;
-    if (posix_spawn(&child, VEXMAP_TOOL_PATH, &actions, attributes, argv.data(), environ) != 0) {
+    if (posix_spawn(&child, VEXMAP_TOOL_PATH, &actions, attributes, argv.data(), envp.data()) !=
+        0) {
         ADD_FAILURE() << "cannot start " << VEXMAP_TOOL_PATH;
         return -1;
     }
@@ -192,7 +203,7 @@ protected:
                                          O_WRONLY | O_CREAT | O_TRUNC, 0644);
         posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, err_path.c_str(),
                                          O_WRONLY | O_CREAT | O_TRUNC, 0644);
-        Outcome outcome = Wait(Start(std::move(arguments), actions));
+        Outcome outcome = Wait(Start(std::move(arguments), actions, nullptr, added_environment));
         posix_spawn_file_actions_destroy(&actions);
         outcome.out = ReadText(out_path);
         outcome.err = ReadText(err_path);
@@ -260,6 +271,7 @@ protected:
     }
 
     std::filesystem::path directory;
+    std::vector<std::string> added_environment;  // for the tool started by Run
 };
 
 // A refusal is an ordinary exit with one line of reason on standard error, none on standard output.
@@ -482,9 +494,9 @@ TEST_F(VexmapTest, ModeOfNoKindIsARuntimeFailure) {
     EXPECT_EQ(RUNTIME_FAILURE, outcome.status);
 }
 
-TEST_F(VexmapTest, UnregisteredModeOneIsARuntimeFailure) {
-    Outcome const outcome = Run({"--mode", "1", "--output", PathOf("views")});
-    EXPECT_EQ("vexmap: no dewarper kind has mode 1\n", outcome.err);
+TEST_F(VexmapTest, UnregisteredModeFourIsARuntimeFailure) {
+    Outcome const outcome = Run({"--mode", "4", "--output", PathOf("views")});
+    EXPECT_EQ("vexmap: no dewarper kind has mode 4\n", outcome.err);
     EXPECT_EQ(RUNTIME_FAILURE, outcome.status);
     EXPECT_FALSE(std::filesystem::exists(directory / "views"));
 }
@@ -802,6 +814,101 @@ std::string FindFfmpeg() {
 
 // ffmpeg reads the stream the test wrote and pipes it to the tool, whose stream another ffmpeg
 // encodes; the file it made is decoded once more and read back.
+class VexmapVendorKindTest : public VexmapTest,
+                             public ::testing::WithParamInterface<char const*> {};
+
+TEST_P(VexmapVendorKindTest, WithoutItsLibraryTheKindIsNotAvailable) {
+    std::string const kind = GetParam();
+    Outcome const outcome = Run({"--kind", kind, "--output", PathOf("views")});
+    EXPECT_EQ(
+        "vexmap: the " + kind + " dewarper is not available: its vendor library is not installed\n",
+        outcome.err);
+    EXPECT_EQ("", outcome.out);
+    EXPECT_EQ(RUNTIME_FAILURE, outcome.status);
+    EXPECT_FALSE(std::filesystem::exists(directory / "views"));
+}
+
+// The test stand-ins of the vendors' libraries, under their names, where the loader is told to
+// look: the tool then finds them as it would find the real ones.
+class VexmapWithVendorLibrariesTest : public VexmapTest,
+                                      public ::testing::WithParamInterface<char const*> {
+protected:
+    void SetUp() override {
+        VexmapTest::SetUp();
+        added_environment = {std::string("LD_LIBRARY_PATH=") + VEXMAP_STANDIN_DIR};
+    }
+};
+
+TEST_P(VexmapWithVendorLibrariesTest, TheKindWritesEachOfItsViews) {
+    std::string const kind = GetParam();
+    std::string const output = PathOf("views");
+    Outcome const outcome = Run({"--kind", kind, "--output", output});
+    ASSERT_TRUE(outcome.exited);
+    EXPECT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_EQ("", outcome.err);
+    EXPECT_THAT(outcome.out, StartsWith(kind + " dewarper (mode "));
+    EXPECT_THAT(outcome.out, HasSubstr(kind + " ptz view, "));
+    std::vector<std::filesystem::path> written;
+    for (auto const& entry : std::filesystem::directory_iterator(output)) {
+        written.push_back(entry.path());
+    }
+    EXPECT_GE(written.size(), 2u);
+    for (auto const& path : written) {
+        RgbImage const picture = ReadImage(path.string());
+        EXPECT_GT(picture.width, 0) << path;
+        // The stand-ins carry the picture over, so the sample's bright walls show.
+        EXPECT_GT(*std::max_element(picture.pixels.begin(), picture.pixels.end()), 100) << path;
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Kinds, VexmapVendorKindTest,
+                         ::testing::Values("ImmerVision", "Samsung", "Vivotek", "Geovision"));
+INSTANTIATE_TEST_SUITE_P(Kinds, VexmapWithVendorLibrariesTest,
+                         ::testing::Values("ImmerVision", "Samsung", "Vivotek", "Geovision"));
+
+TEST_F(VexmapTest, ListShowsEveryKindAndWhetherItIsAvailable) {
+    Outcome const outcome = Run({"--list"});
+    ASSERT_TRUE(outcome.exited);
+    EXPECT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_EQ(
+        " 1 ImmerVision  not available (vendor library not installed)\n"
+        " 2 Sentry360    available\n"
+        " 3 Vivotek      not available (vendor library not installed)\n"
+        " 7 Samsung      not available (vendor library not installed)\n"
+        " 8 Brenvia      available\n"
+        " 9 Geovision    not available (vendor library not installed)\n",
+        outcome.out);
+    EXPECT_EQ("", outcome.err);
+}
+
+TEST_F(VexmapWithVendorLibrariesTest, ListShowsTheLensesOfTheAvailableLensKinds) {
+    Outcome const outcome = Run({"--list"});
+    ASSERT_TRUE(outcome.exited);
+    EXPECT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_THAT(outcome.out, HasSubstr(" 1 ImmerVision  available\n     lens 0: RPL Number "));
+    EXPECT_THAT(outcome.out, HasSubstr(" 3 Vivotek      available\n     lens 0: Default\n"
+                                       "     lens 1: FE8171\n"));
+    EXPECT_THAT(outcome.out, HasSubstr("     lens 7: FE8181\n 7 Samsung      available\n"));
+    EXPECT_THAT(outcome.out, HasSubstr(" 9 Geovision    available\n"));
+}
+
+TEST_F(VexmapWithVendorLibrariesTest, TheLensOfAKindWithLensesIsNamed) {
+    Outcome const outcome = Run(
+        {"--kind", "Vivotek", "--lens", "3", "--submode", "1", "--output", PathOf("vivotek.png")});
+    ASSERT_TRUE(outcome.exited);
+    EXPECT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_THAT(outcome.out, HasSubstr("Vivotek lens 3: FE8173\n"));
+}
+
+TEST_F(VexmapWithVendorLibrariesTest, SamsungStartsFromTheCamerasDefaultLens) {
+    Outcome const outcome = Run({"--make", "Samsung", "--model", "SNF-8010", "--submode", "1",
+                                 "--output", PathOf("samsung.png")});
+    ASSERT_TRUE(outcome.exited);
+    EXPECT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_THAT(outcome.out, HasSubstr("Samsung lens "));
+    EXPECT_THAT(outcome.out, HasSubstr(": RPL Number C7SST\n"));
+}
+
 TEST_F(VexmapTest, PipesThroughFfmpegBothWays) {
     std::string const ffmpeg = FindFfmpeg();
     if (ffmpeg.empty()) {
