@@ -96,52 +96,43 @@ TEST_F(VendorKindsTest, SamsungModelsHaveTheirDefaultLensAndImmerVisionNone) {
     EXPECT_EQ(0, registry->GetDefaultLens(9, "Geovision", "GV-FER"));
 }
 
-TEST_F(VendorKindsTest, ImmerVisionGivesAFrameOfTheInputsSizeInFormat23) {
+// What a vendor kind gives for one frame of a 64 x 64 input.
+struct FrameRow {
+    int mode;
+    int askedWidth;
+    int askedHeight;
+    int inputFormat;
+    int outputFormat;
+    int width;
+    int height;
+    unsigned int size;
+};
+
+class VendorFrameTest : public VendorKindsTest, public ::testing::WithParamInterface<FrameRow> {};
+
+TEST_P(VendorFrameTest, AFrameComesOutInTheKindsFormatAndSize) {
+    FrameRow const row = GetParam();
     CameraRecord record{};
     record.position = 1;
-    Dewarper* dewarper = createDewarper(1, record);
+    Dewarper* dewarper = createDewarper(row.mode, record);
     ASSERT_NE(nullptr, dewarper);
-    Frame const frame = RunFrame(*dewarper, 48, 32);
+    Frame const frame = RunFrame(*dewarper, row.askedWidth, row.askedHeight);
     EXPECT_TRUE(frame.done);
-    EXPECT_EQ(23, frame.inputFormat);
-    EXPECT_EQ(23, frame.outputFormat);
-    EXPECT_EQ(64, frame.width);
-    EXPECT_EQ(64, frame.height);
-    EXPECT_EQ(64u * 64u * 3u / 2u, frame.size);
-    EXPECT_EQ(180, frame.middle);
+    EXPECT_EQ(row.inputFormat, frame.inputFormat);
+    EXPECT_EQ(row.outputFormat, frame.outputFormat);
+    EXPECT_EQ(row.width, frame.width);
+    EXPECT_EQ(row.height, frame.height);
+    EXPECT_EQ(row.size, frame.size);
+    EXPECT_EQ(180, frame.middle);  // the stand-ins carry the picture over
     deleteDewarper(dewarper);
 }
 
-TEST_F(VendorKindsTest, VivotekGivesAFrameOfTheAskedSizeInFormatZero) {
-    CameraRecord record{};
-    record.position = 1;
-    Dewarper* dewarper = createDewarper(3, record);
-    ASSERT_NE(nullptr, dewarper);
-    Frame const frame = RunFrame(*dewarper, 48, 32);
-    EXPECT_TRUE(frame.done);
-    EXPECT_EQ(0, frame.inputFormat);
-    EXPECT_EQ(0, frame.outputFormat);
-    EXPECT_EQ(48, frame.width);
-    EXPECT_EQ(32, frame.height);
-    EXPECT_EQ(48u * 32u * 3u / 2u, frame.size);
-    EXPECT_EQ(180, frame.middle);
-    deleteDewarper(dewarper);
-}
-
-TEST_F(VendorKindsTest, GeovisionTakesFormatThreeAndGivesFormatSix) {
-    CameraRecord record{};
-    record.position = 1;
-    Dewarper* dewarper = createDewarper(9, record);
-    ASSERT_NE(nullptr, dewarper);
-    Frame const frame = RunFrame(*dewarper, 48, 34);
-    EXPECT_TRUE(frame.done);
-    EXPECT_EQ(3, frame.inputFormat);
-    EXPECT_EQ(6, frame.outputFormat);
-    EXPECT_EQ(48, frame.width);
-    EXPECT_EQ(32, frame.height);
-    EXPECT_EQ(48u * 32u * 4u, frame.size);
-    EXPECT_EQ(180, frame.middle);
-    deleteDewarper(dewarper);
-}
+// ImmerVision keeps the input's size; Vivotek gives the size asked; Geovision rounds the height
+// down to a multiple of 4 and gives four bytes a pixel.
+INSTANTIATE_TEST_SUITE_P(Kinds, VendorFrameTest,
+                         ::testing::Values(FrameRow{1, 48, 32, 23, 23, 64, 64, 64 * 64 * 3 / 2},
+                                           FrameRow{7, 48, 32, 23, 23, 64, 64, 64 * 64 * 3 / 2},
+                                           FrameRow{3, 48, 32, 0, 0, 48, 32, 48 * 32 * 3 / 2},
+                                           FrameRow{9, 48, 34, 3, 6, 48, 32, 48 * 32 * 4}));
 
 }  // namespace
