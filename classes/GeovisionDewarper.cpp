@@ -11,14 +11,14 @@ namespace {
 
 constexpr int CLOSED = -1;
 constexpr int CHANNEL = 0;  // the one channel of a dewarper's adapter
-constexpr int QUAD = 3;     // the sub-mode of the library's four-way view
+constexpr int DUAL_PANORAMA = 3;
 constexpr int WALL = 0;
 constexpr int FLOOR = 2;
 constexpr unsigned short FRAME = 1;  // the frame of the PTZ view
 
-// Sub-mode 3 is the SDK's view mode 4; everything else is its single view, 8.
+// The dual panorama is the SDK's view mode 4; everything else is its single view, 8.
 unsigned short ViewModeOf(int subMode) {
-    return subMode == QUAD ? 4 : 8;
+    return subMode == DUAL_PANORAMA ? 4 : 8;
 }
 
 // The SDK numbers mounts 0 ceiling, 1 wall, 2 floor.
@@ -90,7 +90,7 @@ void GeovisionDewarper::SetSubMode(int newSubMode) {
 
 // There is no panorama here.
 bool GeovisionDewarper::IsSubModeSupported(int candidate) {
-    return candidate == 1 || (candidate == QUAD && params.position != WALL);
+    return candidate == 1 || (candidate == DUAL_PANORAMA && params.position != WALL);
 }
 
 bool GeovisionDewarper::IsNormalPTZSupported(int candidate) {
@@ -167,7 +167,7 @@ bool GeovisionDewarper::InitOptions() {
     return true;
 }
 
-// Only the single view has a position; the four-way view is fixed.
+// Only the single view has a position; the panorama cannot be moved.
 void GeovisionDewarper::UpdatePosition() {
     if (subMode != 1 || fishEye == nullptr) {
         return;
