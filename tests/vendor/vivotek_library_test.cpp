@@ -35,4 +35,11 @@ TEST(VivotekFunctions, ReferencesAreCountedAndTheLastReleaseCloses) {
     EXPECT_FALSE(VivotekLibraryInstance.IsOpen());
 }
 
+TEST(VivotekFunctions, ALibraryLackingOneOfTheFunctionsIsNotLoaded) {
+    VendorLibrary<VivotekFunctions> incomplete;
+    EXPECT_FALSE(incomplete.Acquire(VEXMAP_INCOMPLETE_FISHEYESW));
+    EXPECT_FALSE(incomplete.IsOpen());
+    EXPECT_EQ(nullptr, incomplete.Api().Fisheye_Initial);
+}
+
 }  // namespace
