@@ -293,6 +293,17 @@ std::string LensName(DewarpRegister& registry, int mode, int lens) {
     return registry.GetLens(mode, lens, name, sizeof name) > 0 ? name : "";
 }
 
+// The kind chosen and how, and its lens when it has a list of them.
+void PrintKind(FILE* info, DewarpRegister& registry, Choice const& choice,
+               DewarpParams const& params, bool has_lenses) {
+    char const* const kind = registry.GetName(choice.mode);
+    fprintf(info, "%s dewarper (mode %d), chosen %s\n", kind, choice.mode, choice.how.c_str());
+    if (has_lenses) {
+        fprintf(info, "%s lens %d: %s\n", kind, params.lens,
+                LensName(registry, choice.mode, params.lens).c_str());
+    }
+}
+
 // Every kind the plug-in registers, as a client lists them: mode, name, whether it can be used
 // here, and the lenses of a usable kind that has them.
 void ListKinds(PluginHost const& host) {
@@ -382,8 +393,7 @@ int Run(Options const& options) {
         StreamRun const run = WriteStream(options, session, sub_modes.front(), source);
         // For a stream the lines come at its end, so that a failure midway is one line alone.
         if (info != nullptr) {
-            fprintf(info, "%s dewarper (mode %d), chosen %s\n", kind.c_str(), mode,
-                    choice.how.c_str());
+            PrintKind(info, registry, choice, params, has_lenses);
             fprintf(info, "%s %s view, %dx%d, %" PRIu64 " frame%s: %s\n", kind.c_str(),
                     ViewName(sub_modes.front()), run.width, run.height, run.frames,
                     run.frames == 1 ? "" : "s",
@@ -393,11 +403,7 @@ int Run(Options const& options) {
     }
     // Printed once only rendering and writing can fail, so that a refusal leaves stdout empty.
     if (info != nullptr) {
-        fprintf(info, "%s dewarper (mode %d), chosen %s\n", kind.c_str(), mode, choice.how.c_str());
-        if (has_lenses) {
-            fprintf(info, "%s lens %d: %s\n", kind.c_str(), params.lens,
-                    LensName(registry, mode, params.lens).c_str());
-        }
+        PrintKind(info, registry, choice, params, has_lenses);
     }
     for (int const sub_mode : sub_modes) {
         RgbImage const view = session.Render(sub_mode, options.ptz, source.picture, options.width,
