@@ -3,7 +3,7 @@
 #include <map>
 
 #include "IFishEye.h"
-#include "libgeofisheye/geo_fisheye.h"
+#include "geo_fisheye.h"
 
 /// The library's context, shared by every adapter of the process and unlocked: the first adapter
 /// makes it while it is null, and destroying any adapter shuts it down for all.

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "VendorLibrary.h"
-#include "libgeofisheye/geo_fisheye.h"
+#include "geo_fisheye.h"
 
 /// The functions of libgeofisheye that the adapter calls, bound at run time. Every pointer is
 /// null until `Bind` finds them all.

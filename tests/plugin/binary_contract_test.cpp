@@ -164,4 +164,35 @@ TEST_F(BinaryContractTest, WithoutTheirLibrariesTheVendorKindsAreListedButNotLoa
     deleteDewarper(dewarper);
 }
 
+TEST_F(BinaryContractTest, WithoutItsLibraryAVendorDewarperMadeBySlotCreateNeverReachesIt) {
+    CameraRecord const record{};
+    for (int mode : {1, 3, 7, 9}) {
+        Dewarper* dewarper = getRegister()->Create(mode, record);
+        ASSERT_NE(nullptr, dewarper) << mode;
+        EXPECT_FALSE(dewarper->Check()) << mode;
+        unsigned char* buffer = nullptr;
+        unsigned int size = 0;
+        int format = -1;
+        EXPECT_FALSE(dewarper->GetImageInputBuffer(64, 64, &buffer, &size, &format)) << mode;
+        int width = 64;
+        int height = 64;
+        EXPECT_FALSE(dewarper->GetImageOutputBuffer(&width, &height, &buffer, &size, &format));
+        EXPECT_EQ(nullptr, buffer) << mode;
+        dewarper->SetPosition(10, 10, 10);
+        dewarper->SetSubMode(2);
+        deleteDewarper(dewarper);
+    }
+}
+
+TEST_F(BinaryContractTest, WithoutTheirLibrariesTheLensKindsListNoLensAndTryAgainNextTime) {
+    Registry* registry = getRegister();
+    char buffer[8] = "intact";
+    for (int mode : {1, 3, 7}) {
+        EXPECT_EQ(0, registry->GetLens(mode, 0, buffer, sizeof buffer)) << mode;
+        EXPECT_EQ(0, registry->GetLens(mode, 0, buffer, sizeof buffer)) << mode;
+    }
+    EXPECT_STREQ("intact", buffer);
+    EXPECT_EQ(0, registry->GetDefaultLens(7, "Samsung", "SNF-7010"));
+}
+
 }  // namespace

@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "libgeofisheye/geo_fisheye.h"
+#include "geo_fisheye.h"
 
 /// Control of the libgeofisheye stand-in, for the tests that link it. The stand-in records every
 /// call, can be told to fail any function, keeps each object's state (source size, bounds, view,
