@@ -1,5 +1,6 @@
-// The vendor kinds through the plug-in's binary boundary, with the test stand-ins of the vendors'
-// libraries on the loader's search path (this binary's ctest points it there).
+// The vendor kinds through the plug-in's binary boundary: with the test stand-ins of the vendors'
+// libraries on the loader's search path (a ctest of its own points it there), and with one that
+// gets loaded only after the plug-in asked for it.
 
 #include <cstring>
 #include <string>
@@ -134,5 +135,26 @@ INSTANTIATE_TEST_SUITE_P(Kinds, VendorFrameTest,
                                            FrameRow{7, 48, 32, 23, 23, 64, 64, 64 * 64 * 3 / 2},
                                            FrameRow{3, 48, 32, 0, 0, 48, 32, 48 * 32 * 3 / 2},
                                            FrameRow{9, 48, 34, 3, 6, 48, 32, 48 * 32 * 4}));
+
+// Run alone, without the libraries on the search path: a library that a host process gets loaded
+// after the plug-in asked for it is found at the next request, since a failed load is not kept.
+using LibraryInstalledLaterTest = PluginLibraryTest;
+
+TEST_F(LibraryInstalledLaterTest, AFailedLensListIsTriedAgainAndThenFound) {
+    Registry* registry = getRegister();
+    char name[16] = "intact";
+    EXPECT_EQ(0, registry->GetLens(3, 0, name, sizeof name));
+    EXPECT_STREQ("intact", name);
+    EXPECT_FALSE(dewarperLoaded(3));
+    // Loaded by its path, the library answers to its soname from then on, as if installed.
+    void* const vendor = dlopen(VEXMAP_STANDIN_DIR "/libfisheyesw.so.3", RTLD_NOW | RTLD_LOCAL);
+    ASSERT_NE(nullptr, vendor) << dlerror();
+    EXPECT_EQ(7, registry->GetLens(3, 0, name, sizeof name));
+    EXPECT_STREQ("Default", name);
+    EXPECT_EQ(6, registry->GetLens(3, 1, name, sizeof name));
+    EXPECT_STREQ("FE8171", name);
+    EXPECT_TRUE(dewarperLoaded(3));
+    dlclose(vendor);
+}
 
 }  // namespace
