@@ -8,6 +8,7 @@
 
 #include "ImmervisionDewarper.h"
 #include "ImmervisionLibrary.h"
+#include "dewarper_abilities.h"
 #include "imv1_standin.h"
 
 namespace {
@@ -575,17 +576,6 @@ TEST_F(ImmervisionDewarperTest, NormalPtzIsSupportedForTheTwoPanoramasOnly) {
     }
 }
 
-struct AbilityCase {
-    int subMode;
-    int position;
-    bool pan;
-    bool tiltAndZoom;
-};
-
-void PrintTo(AbilityCase const& ability, std::ostream* out) {
-    *out << "sub-mode " << ability.subMode << " at position " << ability.position;
-}
-
 class ImmervisionAbilityTest : public ImmervisionDewarperTest,
                                public ::testing::WithParamInterface<AbilityCase> {};
 
@@ -593,19 +583,10 @@ TEST_P(ImmervisionAbilityTest, PanOffTheWallInEverySubModeTiltAndZoomInTheSingle
     AbilityCase const expected = GetParam();
     Create(Camera(expected.position));
     dewarper->SetSubMode(expected.subMode);
-    for (int asked : {1, 2, 3}) {
-        EXPECT_EQ(expected.pan, dewarper->CanPan(asked)) << asked;
-        EXPECT_EQ(expected.tiltAndZoom, dewarper->CanTilt(asked)) << asked;
-        EXPECT_EQ(expected.tiltAndZoom, dewarper->CanZoom(asked)) << asked;
-    }
+    ExpectAbilities(*dewarper, expected);
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    SubModesAndMounts, ImmervisionAbilityTest,
-    ::testing::Values(AbilityCase{1, WALL, true, true}, AbilityCase{1, CEILING, true, true},
-                      AbilityCase{1, FLOOR, true, true}, AbilityCase{2, WALL, false, false},
-                      AbilityCase{2, CEILING, true, false}, AbilityCase{2, FLOOR, true, false},
-                      AbilityCase{3, WALL, false, false}, AbilityCase{3, CEILING, true, false}));
+INSTANTIATE_TEST_SUITE_P(SubModesAndMounts, ImmervisionAbilityTest, PanoramasTurnOffTheWall());
 
 TEST_F(ImmervisionDewarperTest, APanoramaOffTheWallIsFourTimesAsWideAsItIsHigh) {
     Create(Camera(CEILING));

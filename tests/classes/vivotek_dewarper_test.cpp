@@ -8,6 +8,7 @@
 
 #include "VivotekDewarper.h"
 #include "VivotekLibrary.h"
+#include "dewarper_abilities.h"
 #include "fisheyesw_standin.h"
 
 namespace {
@@ -664,17 +665,6 @@ TEST_F(VivotekDewarperTest, NormalPtzIsSupportedForTheTwoPanoramasOnly) {
     }
 }
 
-struct AbilityCase {
-    int subMode;
-    int position;
-    bool pan;
-    bool tiltAndZoom;
-};
-
-void PrintTo(AbilityCase const& ability, std::ostream* out) {
-    *out << "sub-mode " << ability.subMode << " at position " << ability.position;
-}
-
 class VivotekAbilityTest : public VivotekDewarperTest,
                            public ::testing::WithParamInterface<AbilityCase> {};
 
@@ -682,19 +672,10 @@ TEST_P(VivotekAbilityTest, PanOffTheWallInEverySubModeTiltAndZoomInTheSingleView
     AbilityCase const expected = GetParam();
     Create(Camera(expected.position));
     dewarper->SetSubMode(expected.subMode);
-    for (int asked : {1, 2, 3}) {
-        EXPECT_EQ(expected.pan, dewarper->CanPan(asked)) << asked;
-        EXPECT_EQ(expected.tiltAndZoom, dewarper->CanTilt(asked)) << asked;
-        EXPECT_EQ(expected.tiltAndZoom, dewarper->CanZoom(asked)) << asked;
-    }
+    ExpectAbilities(*dewarper, expected);
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    SubModesAndMounts, VivotekAbilityTest,
-    ::testing::Values(AbilityCase{1, WALL, true, true}, AbilityCase{1, CEILING, true, true},
-                      AbilityCase{1, FLOOR, true, true}, AbilityCase{2, WALL, false, false},
-                      AbilityCase{2, CEILING, true, false}, AbilityCase{2, FLOOR, true, false},
-                      AbilityCase{3, WALL, false, false}, AbilityCase{3, CEILING, true, false}));
+INSTANTIATE_TEST_SUITE_P(SubModesAndMounts, VivotekAbilityTest, PanoramasTurnOffTheWall());
 
 TEST_F(VivotekDewarperTest, AspectRatioIsTheHeightSixteenByNineOrTwoByThreeBySubMode) {
     Create(Camera(CEILING));
