@@ -45,7 +45,9 @@ _DEWARP_INTERNAL_CAMERA_MOUNT MountOf(int position) {
 }  // namespace
 
 BrenviaDewarper::BrenviaDewarper(DewarpParams_t const& creationParams)
-    : IDewarperBaseT(creationParams), channel(nullptr), camera() {}
+    : IDewarperBaseT(creationParams), channel(nullptr), camera() {
+    Clear();
+}
 
 // The engine answers a null handle with a warning, so no test is needed.
 BrenviaDewarper::~BrenviaDewarper() {

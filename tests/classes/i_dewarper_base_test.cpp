@@ -1,4 +1,6 @@
 #include <cmath>
+#include <cstring>
+#include <ostream>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -424,5 +426,114 @@ TEST(IDewarperBase, CommonAnswers) {
     EXPECT_EQ(0.0f, tilt);
     EXPECT_EQ(1.0f, zoom);
 }
+
+// The field table of every registered kind, read on dewarpers that the registry made. The
+// fields are the base's: a class that derives from it may form pointers to them, and those reach
+// the same fields of any dewarper.
+struct BaseFields : IDewarperBase {
+    using Field = float IDewarperBase::*;
+    static DewarpParams_t IDewarperBase::*Params() { return &BaseFields::params; }
+    static DewarperType::DewarperTypes IDewarperBase::*Type() { return &BaseFields::type; }
+    static int IDewarperBase::*InputWidth() { return &BaseFields::inputWidth; }
+    static int IDewarperBase::*InputHeight() { return &BaseFields::inputHeight; }
+    static int IDewarperBase::*OutputWidth() { return &BaseFields::outputWidth; }
+    static int IDewarperBase::*OutputHeight() { return &BaseFields::outputHeight; }
+    static int IDewarperBase::*SubModeField() { return &BaseFields::subMode; }
+    static bool IDewarperBase::*OptionsDirty() { return &BaseFields::optionsDirty; }
+    static Field PanField() { return &BaseFields::pan; }
+    static Field TiltField() { return &BaseFields::tilt; }
+    static Field ZoomField() { return &BaseFields::zoom; }
+    static unsigned char* IDewarperBase::*InputBuffer() { return &BaseFields::inputBuffer; }
+    static unsigned char* IDewarperBase::*OutputBuffer() { return &BaseFields::outputBuffer; }
+};
+
+struct KindDefaults {
+    int mode;
+    float zoom;  // what Clear() gives; pan and tilt are 0 for every kind
+};
+
+std::ostream& operator<<(std::ostream& out, KindDefaults const& kind) {
+    return out << "mode " << kind.mode;
+}
+
+class FieldTableTest : public ::testing::TestWithParam<KindDefaults> {
+protected:
+    static DewarpParams_t CameraParams() {
+        DewarpParams_t params;
+        params.lens = 1;
+        params.position = CEILING;
+        params.panoramaOffset = 15;
+        params.circleX = 320;
+        params.circleY = 240;
+        params.circleRadius = 230;
+        params.extra = strdup("camera 7");
+        return params;
+    }
+
+    void SetUp() override {
+        dewarper = static_cast<IDewarperBase*>(CreateDewarper(GetParam().mode, given));
+        ASSERT_NE(nullptr, dewarper);
+    }
+    void TearDown() override { DeleteDewarper(dewarper); }
+
+    DewarpParams_t const given = CameraParams();
+    IDewarperBase* dewarper = nullptr;
+};
+
+TEST_P(FieldTableTest, ANewDewarperHoldsADeepCopyOfItsParameters) {
+    DewarpParams_t const& held = dewarper->*BaseFields::Params();
+    EXPECT_EQ(&held, dewarper->Parameters());
+    EXPECT_EQ(1, held.lens);
+    EXPECT_EQ(CEILING, held.position);
+    EXPECT_EQ(15, held.panoramaOffset);
+    EXPECT_EQ(320, held.circleX);
+    EXPECT_EQ(240, held.circleY);
+    EXPECT_EQ(230, held.circleRadius);
+    ASSERT_NE(nullptr, held.extra);
+    EXPECT_NE(given.extra, held.extra);
+    EXPECT_STREQ("camera 7", held.extra);
+}
+
+TEST_P(FieldTableTest, ANewDewarperHasNoBuffersAndItsBackendStillToSetUp) {
+    EXPECT_EQ(0, dewarper->*BaseFields::InputWidth());
+    EXPECT_EQ(0, dewarper->*BaseFields::InputHeight());
+    EXPECT_EQ(0, dewarper->*BaseFields::OutputWidth());
+    EXPECT_EQ(0, dewarper->*BaseFields::OutputHeight());
+    EXPECT_EQ(nullptr, dewarper->*BaseFields::InputBuffer());
+    EXPECT_EQ(nullptr, dewarper->*BaseFields::OutputBuffer());
+    EXPECT_TRUE(dewarper->*BaseFields::OptionsDirty());
+    EXPECT_EQ(1, dewarper->*BaseFields::SubModeField());
+    EXPECT_EQ(1, dewarper->SubMode());
+}
+
+// The registry tells each dewarper the mode it was made for; the constructor leaves 0.
+TEST_P(FieldTableTest, ANewDewarperKnowsTheModeItWasMadeFor) {
+    EXPECT_EQ(GetParam().mode, int(dewarper->*BaseFields::Type()));
+}
+
+TEST_P(FieldTableTest, ANewDewarperStartsAtTheDefaultsOfItsKind) {
+    EXPECT_EQ(0.0f, dewarper->*BaseFields::PanField());
+    EXPECT_EQ(0.0f, dewarper->*BaseFields::TiltField());
+    EXPECT_EQ(GetParam().zoom, dewarper->*BaseFields::ZoomField());
+}
+
+TEST_P(FieldTableTest, ANewDewarperIsWhereClearPutsIt) {
+    float const pan = dewarper->*BaseFields::PanField();
+    float const tilt = dewarper->*BaseFields::TiltField();
+    float const zoom = dewarper->*BaseFields::ZoomField();
+    dewarper->*BaseFields::ZoomField() = 3.0f;
+    dewarper->Clear();
+    EXPECT_EQ(pan, dewarper->*BaseFields::PanField());
+    EXPECT_EQ(tilt, dewarper->*BaseFields::TiltField());
+    EXPECT_EQ(zoom, dewarper->*BaseFields::ZoomField());
+}
+
+INSTANTIATE_TEST_SUITE_P(EveryRegisteredKind, FieldTableTest,
+                         ::testing::Values(KindDefaults{DewarperType::DewarperImmervision, 180.0f},
+                                           KindDefaults{DewarperType::DewarperSentry360, 0.7f},
+                                           KindDefaults{DewarperType::DewarperVivotek, 70.0f},
+                                           KindDefaults{DewarperType::DewarperSamsung, 180.0f},
+                                           KindDefaults{DewarperType::DewarperBrenvia, 0.5f},
+                                           KindDefaults{DewarperType::DewarperGeovision, 20.0f}));
 
 }  // namespace

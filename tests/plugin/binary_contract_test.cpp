@@ -1,3 +1,4 @@
+#include <cmath>
 #include <cstring>
 #include <dlfcn.h>
 #include <memory>
@@ -122,6 +123,30 @@ TEST_F(BinaryContractTest, DewarperPositionSlotsMoveThePositionInTheirOrder) {
     EXPECT_EQ(0.0f, pan);
     EXPECT_FLOAT_EQ(0.7f, zoom);
     deleteDewarper(dewarper);
+}
+
+// A host shows a new dewarper's position before the first frame. Brenvia hands out its tilt
+// ten roots of the zoom above the inner one.
+TEST_F(BinaryContractTest, ANewDewarperOfAnInHouseKindAnswersItsKindsDefaultPosition) {
+    struct Expected {
+        int mode;
+        float tilt;
+        float zoom;
+    };
+    for (Expected const expected :
+         {Expected{SENTRY360, 0.0f, 0.7f}, Expected{8, float(10.0 * double(sqrtf(0.5f))), 0.5f}}) {
+        CameraRecord const record{};
+        Dewarper* dewarper = createDewarper(expected.mode, record);
+        ASSERT_NE(nullptr, dewarper) << expected.mode;
+        float pan = -1;
+        float tilt = -1;
+        float zoom = -1;
+        dewarper->GetPosition(pan, tilt, zoom);
+        EXPECT_EQ(0.0f, pan) << expected.mode;
+        EXPECT_EQ(expected.tilt, tilt) << expected.mode;
+        EXPECT_EQ(expected.zoom, zoom) << expected.mode;
+        deleteDewarper(dewarper);
+    }
 }
 
 TEST_F(BinaryContractTest, AFrameGoesInAndComesOutDewarped) {

@@ -97,6 +97,29 @@ TEST_F(VendorKindsTest, SamsungModelsHaveTheirDefaultLensAndImmerVisionNone) {
     EXPECT_EQ(0, registry->GetDefaultLens(9, "Geovision", "GV-FER"));
 }
 
+// Before its first frame a vendor dewarper answers the defaults of its kind: ImmerVision's zoom
+// is its widest field of view.
+TEST_F(VendorKindsTest, ANewVendorDewarperAnswersItsKindsDefaultPosition) {
+    struct Expected {
+        int mode;
+        float zoom;
+    };
+    for (Expected const expected :
+         {Expected{1, 180.0f}, Expected{3, 70.0f}, Expected{7, 180.0f}, Expected{9, 20.0f}}) {
+        CameraRecord const record{};
+        Dewarper* dewarper = createDewarper(expected.mode, record);
+        ASSERT_NE(nullptr, dewarper) << expected.mode;
+        float pan = -1;
+        float tilt = -1;
+        float zoom = -1;
+        dewarper->GetPosition(pan, tilt, zoom);
+        EXPECT_EQ(0.0f, pan) << expected.mode;
+        EXPECT_EQ(0.0f, tilt) << expected.mode;
+        EXPECT_EQ(expected.zoom, zoom) << expected.mode;
+        deleteDewarper(dewarper);
+    }
+}
+
 // What a vendor kind gives for one frame of a 64 x 64 input.
 struct FrameRow {
     int mode;
