@@ -99,8 +99,9 @@ RgbImage Uniform(int width, int height, Rgb const& colour) {
     RgbImage image;
     image.width = width;
     image.height = height;
-    for (int pixel = 0; pixel < width * height; ++pixel) {
-        image.pixels.insert(image.pixels.end(), colour.begin(), colour.end());
+    image.pixels.resize(std::size_t(width) * std::size_t(height) * colour.size());
+    for (std::size_t byte = 0; byte < image.pixels.size(); ++byte) {
+        image.pixels[byte] = colour[byte % colour.size()];
     }
     return image;
 }
