@@ -1,8 +1,11 @@
-# Fails unless the plug-in's dynamic symbol table defines exactly the four exported functions.
-execute_process(COMMAND nm -D --defined-only ${PLUGIN}
+cmake_minimum_required(VERSION 3.25)
+# Fails unless the dynamic symbol table of LIBRARY defines exactly the names in EXPECTED, a list
+# separated by commas (each name with its version, as nm shows it), and, when FORBIDDEN_NEEDED is set, unless no library that
+# LIBRARY needs at run time matches that regular expression.
+execute_process(COMMAND nm -D --defined-only ${LIBRARY}
                 OUTPUT_VARIABLE symbols RESULT_VARIABLE status)
 if(NOT status EQUAL 0)
-    message(FATAL_ERROR "nm failed on ${PLUGIN}")
+    message(FATAL_ERROR "nm failed on ${LIBRARY}")
 endif()
 string(REGEX MATCHALL "[^\n]+" lines "${symbols}")
 set(names "")
@@ -11,7 +14,25 @@ foreach(line IN LISTS lines)
     list(APPEND names "${name}")
 endforeach()
 list(SORT names)
-set(expected CreateDewarper DeleteDewarper DewarperLoaded GetRegister)
-if(NOT names STREQUAL expected)
-    message(FATAL_ERROR "exported: ${names}\nexpected: ${expected}")
+string(REPLACE "," ";" EXPECTED "${EXPECTED}")
+list(SORT EXPECTED)
+if(NOT names STREQUAL EXPECTED)
+    set(extra ${names})
+    list(REMOVE_ITEM extra ${EXPECTED})
+    set(missing ${EXPECTED})
+    list(REMOVE_ITEM missing ${names})
+    message(FATAL_ERROR "${LIBRARY}\nexported beyond the intended: ${extra}\nmissing: ${missing}")
+endif()
+
+if(DEFINED FORBIDDEN_NEEDED)
+    execute_process(COMMAND readelf -d ${LIBRARY} OUTPUT_VARIABLE dynamic RESULT_VARIABLE status)
+    if(NOT status EQUAL 0)
+        message(FATAL_ERROR "readelf failed on ${LIBRARY}")
+    endif()
+    string(REGEX MATCHALL "\\(NEEDED\\)[^\n]*\\[[^]]*\\]" needed "${dynamic}")
+    foreach(entry IN LISTS needed)
+        if(entry MATCHES "${FORBIDDEN_NEEDED}")
+            message(FATAL_ERROR "${LIBRARY} needs ${entry} at run time")
+        endif()
+    endforeach()
 endif()

@@ -1,5 +1,3 @@
-#include "vexmap/dewarp.h"
-
 #include <cerrno>
 #include <cstdint>
 #include <exception>
@@ -7,6 +5,7 @@
 #include "vexmap/bad_exception_handler.h"
 #include "vexmap/channel.h"
 #include "vexmap/defaults.h"
+#include "vexmap/dewarp_inner.h"
 #include "vexmap/error.h"
 #include "vexmap/floating_point.h"
 #include "vexmap/log.h"

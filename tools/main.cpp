@@ -83,10 +83,21 @@ std::string Lowercase(std::string text) {
     return text;
 }
 
+// Beside the program in a build tree; in an installed tree, in the plug-in folder of the library
+// folder that lies beside the program's own.
 std::string DefaultPluginPath() {
+    char const* const file = "libvexmap_dewarp.so";
     std::error_code error;
-    std::filesystem::path const self = std::filesystem::read_symlink("/proc/self/exe", error);
-    return error ? "libvexmap_dewarp.so" : (self.parent_path() / "libvexmap_dewarp.so").string();
+    std::filesystem::path const folder =
+        std::filesystem::read_symlink("/proc/self/exe", error).parent_path();
+    if (error) {
+        return file;
+    }
+    std::filesystem::path const beside = folder / file;
+    if (std::filesystem::exists(beside, error)) {
+        return beside.string();
+    }
+    return (folder / VEXMAP_PLUGIN_FROM_TOOL / file).lexically_normal().string();
 }
 
 bool EndsWith(std::string const& path, std::string const& extension) {
@@ -488,7 +499,8 @@ void AddOptions(CLI::App& app, Options& options) {
                    "PNG file, directory for one file per view, or YUV4MPEG2 stream of one view "
                    "(.y4m, or - for standard output; a still gives one frame) (default: out)");
     app.add_option("--plugin", options.plugin,
-                   "plug-in to load (default: libvexmap_dewarp.so beside this program)");
+                   "plug-in to load (default: libvexmap_dewarp.so beside this program, or in "
+                   "the installed plug-in folder " VEXMAP_PLUGIN_FROM_TOOL ")");
     app.add_option("--frames", options.frames,
                    "frames run per view of a still; from the second on a dewarper replays its "
                    "cached map, as in a live stream (default: 2)")
@@ -504,12 +516,15 @@ int main(int argc, char** argv) {
         "Dewarps a fisheye picture through the vexmap plug-in, loaded as a client "
         "loads it.",
         "vexmap");
+    app.set_version_flag("--version", std::string("vexmap ") + VEXMAP_VERSION);
     Options options;
     AddOptions(app, options);
     try {
         app.parse(argc, argv);
     } catch (CLI::CallForHelp const& help) {
         return app.exit(help);
+    } catch (CLI::CallForVersion const& version) {
+        return app.exit(version);
     } catch (CLI::ParseError const& error) {
         fprintf(stderr, "vexmap: %s (see --help)\n", error.what());
         return USAGE_ERROR;

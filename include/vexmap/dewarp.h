@@ -1,90 +1,76 @@
 #pragma once
 
-// The call surface of the engine: plain functions over channel handles. Nothing thrown inside the
-// engine passes it: each function logs a failure and returns -1 (null from the open calls); 0 is
-// success. A handle is the channel itself and is checked against null only. Not exported from the
-// plug-in: the front layer is its one caller.
+/* The call surface of the vexmap engine: plain C functions over channel handles, the same from
+   C99 and from C++. A channel is one camera (lens, sensor size and mount) and one view of it
+   (single or quad PTZ, single or dual panorama); each frame given to dewarp_image comes out as
+   that view, through a table of source positions built when the view or its position changes.
 
-#include <exception>
+   Nothing thrown inside the engine passes this surface: each function logs a failure through the
+   sink of dewarp_set_log and returns -1 (null from the open calls), most with errno set; 0 is
+   success. A handle is the channel itself and is checked against null only; it belongs to the
+   caller from the open call to dewarp_close. Settings and positions may come from any thread; the
+   frames of one channel come from one thread at a time. Angles are degrees, sizes pixels. */
 
-#include "vexmap/code_location.h"
 #include "vexmap/dewarp_types.h"
+#include "vexmap/version.h"
 
+/* The engine library exports these functions and nothing else; a program that links the engine
+   statically gets them like any other function. */
+#if defined(__GNUC__)
+#define DEWARP_API __attribute__((visibility("default")))
+#else
+#define DEWARP_API
+#endif
+
+#ifdef __cplusplus
 extern "C" {
+#endif
 
-int dewarp_set_log(_DEWARP_LOG_SETTINGS const* settings);
-void* dewarp_open(_DEWARP_CHANNEL_SETTINGS const* settings);
-int dewarp_channel_valid(void* channel);
-int dewarp_set_view(void* channel, _DEWARP_VIEW view);
-int dewarp_set_projection(void* channel, _DEWARP_VIEW view, _DEWARP_PROJECTION projection);
-int dewarp_set_interpolation(void* channel, _DEWARP_INTERPOLATION interpolation);
-int dewarp_set_aspect_ratio(void* channel, _DEWARP_ASPECT_RATIO aspect_ratio);
-int dewarp_get_settings(void* channel, _DEWARP_CHANNEL_SETTINGS* settings);
-int dewarp_get_native_resolution(void* channel, _DEWARP_RESOLUTION* resolution);
-/// A null position sends the view home.
-int dewarp_set_ptz(void* channel, _DEWARP_PTZ_POSITION* position);
-int dewarp_get_ptz(void* channel, _DEWARP_PTZ_POSITION* position);
-int dewarp_get_ptz_range(void* channel, _DEWARP_PTZ_RANGE* range);
-int dewarp_calc_ptz_position(void* channel, int x, int y, float zoom,
-                             _DEWARP_PTZ_POSITION* position);
-int dewarp_image(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewarped);
-void dewarp_close(void* channel);
-void* dewarp_internal_open(_DEWARP_INTERNAL_CAMERA_MODEL const* model,
-                           _DEWARP_INTERNAL_CAMERA_MOUNT mount,
-                           _DEWARP_CHANNEL_SETTINGS const* settings);
-int dewarp_internal_get_model(void* channel, _DEWARP_INTERNAL_CAMERA_MODEL* model);
-int dewarp_internal_set_model(void* channel, _DEWARP_INTERNAL_CAMERA_MODEL const* model);
-/// The mount; 2 for a null handle; -1 if something was thrown.
-int dewarp_internal_get_mount(void* channel);
-int dewarp_internal_set_mount(void* channel, _DEWARP_INTERNAL_CAMERA_MOUNT mount);
+/* Installs the process-wide log sink and its level (0 errors to 2 information); null stops
+   logging. */
+DEWARP_API int dewarp_set_log(_DEWARP_LOG_SETTINGS const* settings);
 
-}  // extern "C"
+/* A channel without a camera: calls that need a view fail until dewarp_internal_set_model. Null
+   settings take the defaults. */
+DEWARP_API void* dewarp_open(_DEWARP_CHANNEL_SETTINGS const* settings);
+/* A channel on a camera model fixed on a mount. Null settings take the defaults, with the
+   camera's own projection and aspect ratio. */
+DEWARP_API void* dewarp_internal_open(_DEWARP_INTERNAL_CAMERA_MODEL const* model,
+                                      _DEWARP_INTERNAL_CAMERA_MOUNT mount,
+                                      _DEWARP_CHANNEL_SETTINGS const* settings);
+/* 0 for any handle that is not null, also one that was closed. */
+DEWARP_API int dewarp_channel_valid(void* channel);
+DEWARP_API void dewarp_close(void* channel);
 
-// The checks of the call surface. Each throws Error located at the given place; most set the last
-// error first. The log-level checks only warn.
-void Verify(quorvel::vexmap::CodeLocation const& location, float value, float min, float max,
-            char const* name);
-void Verify(quorvel::vexmap::CodeLocation const& location, void const* pointer, unsigned long size,
-            char const* name);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_LOG_LEVEL level);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_LOG_SETTINGS const& settings);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_INTERPOLATION interpolation);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_PROJECTION projection);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_VIEW view);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_ASPECT_RATIO aspect_ratio);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_IMAGE_FORMAT format);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_IMAGE_INFO const& info);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_IMAGE const& image);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_PTZ_POSITION const& position);
-void Verify(quorvel::vexmap::CodeLocation const& location,
-            _DEWARP_CHANNEL_SETTINGS const& settings);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_INTERNAL_CAMERA_TYPE type);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_INTERNAL_CAMERA_MOUNT mount);
-void Verify(quorvel::vexmap::CodeLocation const& location, _DEWARP_INTERNAL_CAMERA_MODEL model);
+DEWARP_API int dewarp_set_view(void* channel, _DEWARP_VIEW view);
+DEWARP_API int dewarp_set_projection(void* channel, _DEWARP_VIEW view,
+                                     _DEWARP_PROJECTION projection);
+/* Stored and reported only: the nearest source pixel is taken whatever it says. */
+DEWARP_API int dewarp_set_interpolation(void* channel, _DEWARP_INTERPOLATION interpolation);
+DEWARP_API int dewarp_set_aspect_ratio(void* channel, _DEWARP_ASPECT_RATIO aspect_ratio);
+DEWARP_API int dewarp_get_settings(void* channel, _DEWARP_CHANNEL_SETTINGS* settings);
+DEWARP_API int dewarp_get_native_resolution(void* channel, _DEWARP_RESOLUTION* resolution);
 
-/// What a caller of the pointer check passes for a size: always 0.
-unsigned long SizeOf(_DEWARP_IMAGE_INFO const& info);
-unsigned long SizeOf(_DEWARP_IMAGE const* image);
+/* Moves the view; the position is limited to what the view can show and written back. A null
+   position sends the view home. */
+DEWARP_API int dewarp_set_ptz(void* channel, _DEWARP_PTZ_POSITION* position);
+DEWARP_API int dewarp_get_ptz(void* channel, _DEWARP_PTZ_POSITION* position);
+DEWARP_API int dewarp_get_ptz_range(void* channel, _DEWARP_PTZ_RANGE* range);
+/* The position that looks at pixel (x, y) of the dewarped picture, at the given zoom. */
+DEWARP_API int dewarp_calc_ptz_position(void* channel, int x, int y, float zoom,
+                                        _DEWARP_PTZ_POSITION* position);
 
-// The inner functions: the handle, the arguments, then the channel. They let out only
-// std::exception and its kin; the outer functions turn those into a log line and a result.
-int SetLog(_DEWARP_LOG_SETTINGS const* settings);
-void* Open(_DEWARP_CHANNEL_SETTINGS const* settings);
-void* Open(_DEWARP_INTERNAL_CAMERA_MODEL const* model, _DEWARP_INTERNAL_CAMERA_MOUNT mount,
-           _DEWARP_CHANNEL_SETTINGS const* settings);
-int SetView(void* channel, _DEWARP_VIEW view);
-int SetProjection(void* channel, _DEWARP_VIEW view, _DEWARP_PROJECTION projection);
-int SetInterpolation(void* channel, _DEWARP_INTERPOLATION interpolation);
-int SetAspectRatio(void* channel, _DEWARP_ASPECT_RATIO aspect_ratio);
-int GetSettings(void* channel, _DEWARP_CHANNEL_SETTINGS* settings);
-int GetNativeResolution(void* channel, _DEWARP_RESOLUTION* resolution);
-int SetPtz(void* channel, _DEWARP_PTZ_POSITION* position);
-int GetPtz(void* channel, _DEWARP_PTZ_POSITION* position);
-int GetPtzRange(void* channel, _DEWARP_PTZ_RANGE* range);
-int CalcPtzPosition(void* channel, int x, int y, float zoom, _DEWARP_PTZ_POSITION* position);
-int DewarpImage(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewarped);
-void Close(void* channel);
-int GetModel(void* channel, _DEWARP_INTERNAL_CAMERA_MODEL* model);
-int SetModel(void* channel, _DEWARP_INTERNAL_CAMERA_MODEL const* model);
-int GetMount(void* channel);
-int SetMount(void* channel, _DEWARP_INTERNAL_CAMERA_MOUNT mount);
+/* Dewarps one frame into the caller's buffer, at the size and in the layout that `dewarped`
+   describes. Both buffers stay the caller's. */
+DEWARP_API int dewarp_image(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewarped);
+
+DEWARP_API int dewarp_internal_get_model(void* channel, _DEWARP_INTERNAL_CAMERA_MODEL* model);
+/* A new model puts the camera on the default mount (wall). */
+DEWARP_API int dewarp_internal_set_model(void* channel, _DEWARP_INTERNAL_CAMERA_MODEL const* model);
+/* The mount; 2 for a null handle; -1 if something was thrown. */
+DEWARP_API int dewarp_internal_get_mount(void* channel);
+DEWARP_API int dewarp_internal_set_mount(void* channel, _DEWARP_INTERNAL_CAMERA_MOUNT mount);
+
+#ifdef __cplusplus
+} /* extern "C" */
+#endif

@@ -1,5 +1,3 @@
-#include "vexmap/dewarp.h"
-
 #include <algorithm>
 #include <cerrno>
 #include <cstddef>
@@ -15,9 +13,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "dewarp_c_side.h"
 #include "recording_log_sink.h"
 #include "vexmap/channel.h"
 #include "vexmap/defaults.h"
+#include "vexmap/dewarp_inner.h"
 #include "vexmap/error.h"
 #include "vexmap/log.h"
 
@@ -1249,6 +1249,32 @@ TEST(Dewarp, SizeOfIsAlwaysZero) {
     EXPECT_EQ(0ul, SizeOf(warped.Image().info));
     EXPECT_EQ(0ul, SizeOf(&warped.Image()));
     EXPECT_EQ(0ul, SizeOf(static_cast<_DEWARP_IMAGE const*>(nullptr)));
+}
+
+// The same calls made from C: enumerations and records cross the surface as C lays them out.
+TEST(Dewarp, ACallerInCGetsTheFrameThatTheSameCallsGiveInCpp) {
+    std::vector<unsigned char> input(64 * 64 * 3 / 2);
+    for (size_t index = 0; index < input.size(); ++index) {
+        input[index] = static_cast<unsigned char>(index * 7 + index / 64);
+    }
+    std::vector<unsigned char> from_c(32 * 24 * 3 / 2, 0xEE);
+    ASSERT_EQ(0, c_dewarp_one_frame(input.data(), from_c.data()));
+
+    _DEWARP_INTERNAL_CAMERA_MODEL const model{
+        DEWARP_INTERNAL_CAMERA_TYPE_CIRCULAR_FISHEYE, 180.0f, 180.0f, 180.0f, 64, 64};
+    _DEWARP_CHANNEL_SETTINGS const settings{DEWARP_VIEW_SINGLE_PTZ, DEWARP_PROJECTION_RECTILINEAR,
+                                            DEWARP_ASPECT_RATIO_STRETCH, DEWARP_INTERPOLATION_0};
+    void* const channel =
+        dewarp_internal_open(&model, DEWARP_INTERNAL_CAMERA_MOUNT_CEILING, &settings);
+    ASSERT_NE(nullptr, channel);
+    _DEWARP_PTZ_POSITION position{30.0f, 40.0f, 0.0f, 1.0f};
+    ASSERT_EQ(0, dewarp_set_ptz(channel, &position));
+    std::vector<unsigned char> from_cpp(from_c.size(), 0x11);
+    _DEWARP_IMAGE const warped{{DEWARP_IMAGE_FORMAT_YUV420_PLANAR, 64, 64, 64}, input.data()};
+    _DEWARP_IMAGE dewarped{{DEWARP_IMAGE_FORMAT_YUV420_PLANAR, 32, 24, 32}, from_cpp.data()};
+    ASSERT_EQ(0, dewarp_image(channel, &warped, &dewarped));
+    dewarp_close(channel);
+    EXPECT_EQ(from_cpp, from_c);
 }
 
 }  // namespace

@@ -1,8 +1,11 @@
 #include "vexmap/dewarp_types.h"
 
 #include <cstddef>
+#include <iterator>
 
 #include <gtest/gtest.h>
+
+#include "dewarp_c_side.h"
 
 namespace {
 
@@ -87,6 +90,22 @@ TEST(DewarpTypes, RecordsKeepTheirFieldOrder) {
     EXPECT_EQ(12u, offsetof(_DEWARP_INTERNAL_CAMERA_MODEL, vertical_fov));
     EXPECT_EQ(16u, offsetof(_DEWARP_INTERNAL_CAMERA_MODEL, width));
     EXPECT_EQ(24u, offsetof(_DEWARP_INTERNAL_CAMERA_MODEL, height));
+}
+
+// A C program and the engine must agree on every record byte for byte; C gives an enumeration a
+// type of its own choosing, so its size is part of what is compared.
+TEST(DewarpTypes, CLaysEveryRecordOutAsCppDoes) {
+    struct Figure {
+        char const* expression;
+        size_t value;
+    };
+#define AS_FIGURE(expression) Figure{#expression, expression},
+    Figure const figures[] = {VEXMAP_RECORD_LAYOUT(AS_FIGURE)};
+#undef AS_FIGURE
+    ASSERT_EQ(std::size(figures), c_record_layout_count);
+    for (size_t index = 0; index < std::size(figures); ++index) {
+        EXPECT_EQ(figures[index].value, c_record_layout[index]) << figures[index].expression;
+    }
 }
 
 }  // namespace
