@@ -56,8 +56,9 @@ if(VEXMAP_BUILD_TOOLS)
             OUTPUT ${PROJECT_BINARY_DIR}/vexmap.1
             COMMAND ${HELP2MAN} --no-info --no-discard-stderr
                     --name "dewarp fisheye pictures and streams through the vexmap plug-in"
+                    --include ${PROJECT_SOURCE_DIR}/tools/vexmap.h2m
                     --output ${PROJECT_BINARY_DIR}/vexmap.1 $<TARGET_FILE:vexmap>
-            DEPENDS vexmap vexmap_dewarp
+            DEPENDS vexmap vexmap_dewarp ${PROJECT_SOURCE_DIR}/tools/vexmap.h2m
             COMMENT "Writing the manual page of vexmap")
         add_custom_target(vexmap_manual ALL DEPENDS ${PROJECT_BINARY_DIR}/vexmap.1)
         install(FILES ${PROJECT_BINARY_DIR}/vexmap.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1
