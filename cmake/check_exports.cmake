@@ -1,7 +1,8 @@
 cmake_minimum_required(VERSION 3.25)
 # Fails unless the dynamic symbol table of LIBRARY defines exactly the names in EXPECTED, a list
-# separated by commas (each name with its version, as nm shows it), and, when FORBIDDEN_NEEDED is set, unless no library that
-# LIBRARY needs at run time matches that regular expression.
+# separated by commas (each name with its version, as nm shows it); unless, when FORBIDDEN_NEEDED
+# is set, no library that LIBRARY needs at run time matches that regular expression; and unless,
+# when SONAME is set, that is the library's soname.
 execute_process(COMMAND nm -D --defined-only ${LIBRARY}
                 OUTPUT_VARIABLE symbols RESULT_VARIABLE status)
 if(NOT status EQUAL 0)
@@ -24,15 +25,22 @@ if(NOT names STREQUAL EXPECTED)
     message(FATAL_ERROR "${LIBRARY}\nexported beyond the intended: ${extra}\nmissing: ${missing}")
 endif()
 
+execute_process(COMMAND readelf -d ${LIBRARY} OUTPUT_VARIABLE dynamic RESULT_VARIABLE status)
+if(NOT status EQUAL 0)
+    message(FATAL_ERROR "readelf failed on ${LIBRARY}")
+endif()
 if(DEFINED FORBIDDEN_NEEDED)
-    execute_process(COMMAND readelf -d ${LIBRARY} OUTPUT_VARIABLE dynamic RESULT_VARIABLE status)
-    if(NOT status EQUAL 0)
-        message(FATAL_ERROR "readelf failed on ${LIBRARY}")
-    endif()
     string(REGEX MATCHALL "\\(NEEDED\\)[^\n]*\\[[^]]*\\]" needed "${dynamic}")
     foreach(entry IN LISTS needed)
         if(entry MATCHES "${FORBIDDEN_NEEDED}")
             message(FATAL_ERROR "${LIBRARY} needs ${entry} at run time")
         endif()
     endforeach()
+endif()
+
+if(DEFINED SONAME)
+    string(REGEX MATCH "\\(SONAME\\)[^\n]*\\[([^]]*)\\]" entry "${dynamic}")
+    if(NOT CMAKE_MATCH_1 STREQUAL SONAME)
+        message(FATAL_ERROR "${LIBRARY} has the soname '${CMAKE_MATCH_1}', not '${SONAME}'")
+    endif()
 endif()

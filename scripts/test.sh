@@ -24,6 +24,11 @@ total_failed=0
 total_skipped=0
 total_test_seconds=0
 
+# A build shows what the compiler says, not a line a step.
+build() {
+    cmake --build "$@" -- --quiet
+}
+
 begin_phase() {
     phase=$1
     phase_started=$SECONDS
@@ -107,38 +112,39 @@ trap print_summary EXIT
 
 begin_phase "set-up"
 ./scripts/setup.sh build test
+summary+=("$(printf "$summary_format" "$phase" - - - - - "$((SECONDS - phase_started)) s")")
 phase=""
 
 begin_phase "g++ RelWithDebInfo, every test (build/)"
 configure_main_build
-cmake --build build -j "$jobs"
+build build -j "$jobs"
 run_tests build -j "$jobs"
 
 begin_phase "g++ Release, every test (build-release/)"
 cmake -S . -B build-release -G Ninja -DCMAKE_BUILD_TYPE=Release -DCMAKE_C_COMPILER=gcc \
       -DCMAKE_CXX_COMPILER=g++ -DVEXMAP_WERROR=ON -DVEXMAP_BUILD_TESTS=ON \
       -DVEXMAP_BUILD_TOOLS=ON -DVEXMAP_BUILD_BENCHMARKS=ON >/dev/null
-cmake --build build-release -j "$jobs"
+build build-release -j "$jobs"
 run_tests build-release -j "$jobs"
 
 begin_phase "clang ThreadSanitizer, channel threads (build-tsan/)"
 cmake -S . -B build-tsan -G Ninja -DCMAKE_BUILD_TYPE=Debug -DCMAKE_C_COMPILER=clang \
       -DCMAKE_CXX_COMPILER=clang++ -DVEXMAP_WERROR=ON -DVEXMAP_THREAD_SANITIZE=ON \
       -DVEXMAP_BUILD_TESTS=ON -DVEXMAP_BUILD_BENCHMARKS=OFF -DVEXMAP_BUILD_TOOLS=OFF >/dev/null
-cmake --build build-tsan -j "$jobs" --target channel_thread_tests
+build build-tsan -j "$jobs" --target channel_thread_tests
 TSAN_OPTIONS=halt_on_error=1 run_tests build-tsan -R '^channel_thread_tests$'
 
 begin_phase "clang libFuzzer, fuzz targets (build-fuzz/)"
 cmake -S . -B build-fuzz -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo -DCMAKE_C_COMPILER=clang \
       -DCMAKE_CXX_COMPILER=clang++ -DVEXMAP_WERROR=ON -DVEXMAP_FUZZ=ON \
       -DVEXMAP_BUILD_BENCHMARKS=OFF -DVEXMAP_BUILD_TOOLS=OFF -DVEXMAP_BUILD_TESTS=OFF >/dev/null
-cmake --build build-fuzz -j "$jobs" --target fuzz_targets
+build build-fuzz -j "$jobs" --target fuzz_targets
 run_tests build-fuzz
 
 begin_phase "clang ASan+UBSan, every test (build-sanitize/)"
 cmake -S . -B build-sanitize -G Ninja -DCMAKE_BUILD_TYPE=Debug -DCMAKE_C_COMPILER=clang \
       -DCMAKE_CXX_COMPILER=clang++ -DVEXMAP_WERROR=ON -DVEXMAP_SANITIZE=ON \
       -DVEXMAP_BUILD_TESTS=ON -DVEXMAP_BUILD_TOOLS=ON -DVEXMAP_BUILD_BENCHMARKS=OFF >/dev/null
-cmake --build build-sanitize -j "$jobs"
+build build-sanitize -j "$jobs"
 ASAN_OPTIONS=detect_leaks=1:abort_on_error=0 UBSAN_OPTIONS=print_stacktrace=1 \
     run_tests build-sanitize -j "$jobs"
