@@ -52,6 +52,18 @@ foreach(file IN LISTS installed)
     endif()
 endforeach()
 
+# The engine's C++ headers are installed whole: together they compile with nothing but the prefix
+# and Boost.
+file(GLOB headers RELATIVE ${prefix}/${INCLUDEDIR} ${prefix}/${INCLUDEDIR}/vexmap/*.h)
+set(all_headers "")
+foreach(header IN LISTS headers)
+    string(APPEND all_headers "#include <${header}>\n")
+endforeach()
+file(WRITE ${WORK_DIR}/all_headers.cpp "${all_headers}")
+run("compiling every installed header"
+    COMMAND ${CXX_COMPILER} -std=c++17 -fsyntax-only -I${prefix}/${INCLUDEDIR}
+            ${WORK_DIR}/all_headers.cpp)
+
 # The installed tool finds the installed plug-in from its own place.
 run("vexmap --version" COMMAND ${prefix}/${BINDIR}/vexmap --version OUTPUT version_line)
 if(NOT version_line STREQUAL "vexmap ${VERSION}\n")
