@@ -135,17 +135,11 @@ TEST_F(BinaryContractTest, ANewDewarperOfAnInHouseKindAnswersItsKindsDefaultPosi
     };
     for (Expected const expected :
          {Expected{SENTRY360, 0.0f, 0.7f}, Expected{8, float(10.0 * double(sqrtf(0.5f))), 0.5f}}) {
-        CameraRecord const record{};
-        Dewarper* dewarper = createDewarper(expected.mode, record);
-        ASSERT_NE(nullptr, dewarper) << expected.mode;
-        float pan = -1;
-        float tilt = -1;
-        float zoom = -1;
-        dewarper->GetPosition(pan, tilt, zoom);
-        EXPECT_EQ(0.0f, pan) << expected.mode;
-        EXPECT_EQ(expected.tilt, tilt) << expected.mode;
-        EXPECT_EQ(expected.zoom, zoom) << expected.mode;
-        deleteDewarper(dewarper);
+        NewPosition const position = PositionOfANewDewarper(expected.mode);
+        ASSERT_TRUE(position.made) << expected.mode;
+        EXPECT_EQ(0.0f, position.pan) << expected.mode;
+        EXPECT_EQ(expected.tilt, position.tilt) << expected.mode;
+        EXPECT_EQ(expected.zoom, position.zoom) << expected.mode;
     }
 }
 

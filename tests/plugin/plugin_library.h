@@ -31,6 +31,26 @@ protected:
         }
     }
 
+    /// What a dewarper just made by the exported `CreateDewarper` answers to `GetPosition`.
+    struct NewPosition {
+        bool made = false;
+        float pan = -1.0f;
+        float tilt = -1.0f;
+        float zoom = -1.0f;
+    };
+
+    NewPosition PositionOfANewDewarper(int mode) {
+        NewPosition position;
+        host_side::CameraRecord const record{};
+        host_side::Dewarper* dewarper = createDewarper(mode, record);
+        if (dewarper != nullptr) {
+            position.made = true;
+            dewarper->GetPosition(position.pan, position.tilt, position.zoom);
+            deleteDewarper(dewarper);
+        }
+        return position;
+    }
+
     void* library = nullptr;
     host_side::Registry* (*getRegister)() = nullptr;
     host_side::Dewarper* (*createDewarper)(int, host_side::CameraRecord const&) = nullptr;

@@ -106,17 +106,11 @@ TEST_F(VendorKindsTest, ANewVendorDewarperAnswersItsKindsDefaultPosition) {
     };
     for (Expected const expected :
          {Expected{1, 180.0f}, Expected{3, 70.0f}, Expected{7, 180.0f}, Expected{9, 20.0f}}) {
-        CameraRecord const record{};
-        Dewarper* dewarper = createDewarper(expected.mode, record);
-        ASSERT_NE(nullptr, dewarper) << expected.mode;
-        float pan = -1;
-        float tilt = -1;
-        float zoom = -1;
-        dewarper->GetPosition(pan, tilt, zoom);
-        EXPECT_EQ(0.0f, pan) << expected.mode;
-        EXPECT_EQ(0.0f, tilt) << expected.mode;
-        EXPECT_EQ(expected.zoom, zoom) << expected.mode;
-        deleteDewarper(dewarper);
+        NewPosition const position = PositionOfANewDewarper(expected.mode);
+        ASSERT_TRUE(position.made) << expected.mode;
+        EXPECT_EQ(0.0f, position.pan) << expected.mode;
+        EXPECT_EQ(0.0f, position.tilt) << expected.mode;
+        EXPECT_EQ(expected.zoom, position.zoom) << expected.mode;
     }
 }
 
