@@ -22,24 +22,65 @@ std::string Contents(FILE* file) {
 
 class ProgressLineTest : public ::testing::Test {
 protected:
+    // A clock the test moves by hand.
+    ProgressLine::Clock Clock() {
+        return [this] { return now; };
+    }
+
     std::unique_ptr<FILE, int (*)(FILE*)> file{tmpfile(), fclose};
+    double now = 100.0;
 };
 
-TEST_F(ProgressLineTest, RewritesTheFrameNumberInPlaceAndEndsTheLine) {
+TEST_F(ProgressLineTest, RewritesTheLineInPlaceAtMostFourTimesASecondAndEndsItWithTheLastState) {
     ASSERT_NE(nullptr, file);
     {
-        ProgressLine progress(file.get(), true);
+        ProgressLine progress(file.get(), true, Clock());
+        now += 0.1;
         progress.Show(1);
-        progress.Show(2);
-        progress.Show(120);
+        now += 0.1;
+        progress.Show(2);  // too soon after the first: not drawn
+        now += 0.2;
+        progress.Show(3);
+        now += 0.1;
+        progress.Show(4);
     }
-    EXPECT_EQ("\rframe 1\rframe 2\rframe 120\n", Contents(file.get()));
+    EXPECT_EQ("\rframe 1, 10.0 fps\rframe 3, 7.5 fps \rframe 4, 8.0 fps\n", Contents(file.get()));
+}
+
+TEST_F(ProgressLineTest, KnownLengthAddsTheShareDoneAndTheTimeLeft) {
+    EXPECT_EQ("frame 40, 20.0 fps, 40%, 0:03 left", ProgressLine::Text(40, 2.0, 0.4));
+    EXPECT_EQ("frame 900, 1.0 fps, 90%, 1:40 left", ProgressLine::Text(900, 900.0, 0.9));
+    EXPECT_EQ("frame 1, 0.1 fps, 0%, 2:46:30 left", ProgressLine::Text(1, 10.0, 0.001));
+}
+
+TEST_F(ProgressLineTest, ShareBeyondTheWholeShowsAsDone) {
+    EXPECT_EQ("frame 11, 11.0 fps, 100%, 0:00 left", ProgressLine::Text(11, 1.0, 1.2));
+}
+
+TEST_F(ProgressLineTest, NoTimeYetShowsNoRate) {
+    EXPECT_EQ("frame 1", ProgressLine::Text(1, 0.0, -1.0));
+    EXPECT_EQ("frame 1, 50%", ProgressLine::Text(1, 0.0, 0.5));
+}
+
+TEST_F(ProgressLineTest, BlanksWhatALongerTextLeftOnTheLine) {
+    ASSERT_NE(nullptr, file);
+    {
+        ProgressLine progress(file.get(), true, Clock());
+        now += 1.0;
+        progress.Show(10, 0.5);
+        now += 1.0;
+        progress.Show(11, -1.0);
+    }
+    std::string const first = "frame 10, 10.0 fps, 50%, 0:01 left";
+    std::string const second = "frame 11, 5.5 fps";
+    EXPECT_EQ("\r" + first + "\r" + second + std::string(first.size() - second.size(), ' ') + "\n",
+              Contents(file.get()));
 }
 
 TEST_F(ProgressLineTest, EndsTheLineOnceHoweverOftenItIsEnded) {
     ASSERT_NE(nullptr, file);
     {
-        ProgressLine progress(file.get(), true);
+        ProgressLine progress(file.get(), true, Clock());
         progress.Show(7);
         progress.End();
         progress.End();
@@ -50,7 +91,7 @@ TEST_F(ProgressLineTest, EndsTheLineOnceHoweverOftenItIsEnded) {
 TEST_F(ProgressLineTest, WritesNothingBeforeTheFirstFrame) {
     ASSERT_NE(nullptr, file);
     {
-        ProgressLine progress(file.get(), true);
+        ProgressLine progress(file.get(), true, Clock());
         progress.End();
     }
     EXPECT_EQ("", Contents(file.get()));
@@ -59,7 +100,7 @@ TEST_F(ProgressLineTest, WritesNothingBeforeTheFirstFrame) {
 TEST_F(ProgressLineTest, WritesNothingWhenNotShown) {
     ASSERT_NE(nullptr, file);
     {
-        ProgressLine progress(file.get(), false);
+        ProgressLine progress(file.get(), false, Clock());
         progress.Show(1);
         progress.Show(2);
     }
