@@ -15,11 +15,25 @@ namespace {
 constexpr double KR = 0.299;
 constexpr double KB = 0.114;
 constexpr double KG = 1.0 - KR - KB;
-constexpr double LUMA_SCALE = 219.0 / 255.0;
-constexpr double CB_SCALE = 224.0 / 255.0 / (2.0 * (1.0 - KB));
-constexpr double CR_SCALE = 224.0 / 255.0 / (2.0 * (1.0 - KR));
-constexpr double LUMA_BLACK = 16.0;
 constexpr double CHROMA_ZERO = 128.0;
+
+/// Bytes of Y'CbCr from bytes of RGB: luma = black + luma_scale * Y', a colour difference =
+/// 128 + its scale * (B - Y') or (R - Y'). Full range spans the whole byte, so its luma scale is 1
+/// and each difference, spanning 2 (1 - KB) or 2 (1 - KR), is divided by that span.
+struct Scales {
+    double luma_black;
+    double luma_scale;
+    double cb_scale;
+    double cr_scale;
+};
+
+constexpr Scales LIMITED_SCALES{16.0, 219.0 / 255.0, 224.0 / 255.0 / (2.0 * (1.0 - KB)),
+                                224.0 / 255.0 / (2.0 * (1.0 - KR))};
+constexpr Scales FULL_SCALES{0.0, 1.0, 1.0 / (2.0 * (1.0 - KB)), 1.0 / (2.0 * (1.0 - KR))};
+
+Scales const& ScalesOf(ColourRange range) {
+    return range == ColourRange::FULL ? FULL_SCALES : LIMITED_SCALES;
+}
 
 uint8_t ToByte(double value) {
     return uint8_t(std::lround(std::clamp(value, 0.0, 255.0)));
@@ -39,7 +53,8 @@ void RequireWhole(YuvImage const& image) {
 
 }  // namespace
 
-PixelFormat::PixelFormat(int frame_format) : format(frame_format) {
+PixelFormat::PixelFormat(int frame_format, ColourRange colour_range)
+    : format(frame_format), range(colour_range) {
     if (format != I420 && format != RGB24 && format != RGBX32 && format != PLANAR_420) {
         throw ToolError("the tool cannot convert pixel format " + std::to_string(format));
     }
@@ -70,7 +85,7 @@ void PixelFormat::RequireSize(int width, int height, std::size_t size) const {
 
 void PixelFormat::Encode(RgbImage const& image, unsigned char* buffer, std::size_t size) const {
     if (IsPlanar420()) {
-        Store(ToYuv(image), buffer, size);
+        Store(ToYuv(image, range), buffer, size);
     } else {
         Store(image, buffer, size);
     }
@@ -80,7 +95,7 @@ void PixelFormat::Encode(YuvImage const& image, unsigned char* buffer, std::size
     if (IsPlanar420()) {
         Store(image, buffer, size);
     } else {
-        Store(ToRgb(image), buffer, size);
+        Store(ToRgb(image, range), buffer, size);
     }
 }
 
@@ -89,7 +104,7 @@ RgbImage PixelFormat::Decode(int width, int height, unsigned char const* buffer,
     RequireSize(width, height, size);
     if (IsPlanar420()) {
         YuvImage const image{width, height, std::vector<uint8_t>(buffer, buffer + size)};
-        return ToRgb(image);
+        return ToRgb(image, range);
     }
     return Unpack(width, height, buffer);
 }
@@ -110,7 +125,7 @@ YuvImage PixelFormat::DecodeYuv(int width, int height, unsigned char const* buff
     if (IsPlanar420()) {
         return YuvImage{width, height, std::vector<uint8_t>(buffer, buffer + size)};
     }
-    return ToYuv(Unpack(width, height, buffer));
+    return ToYuv(Unpack(width, height, buffer), range);
 }
 
 void PixelFormat::Store(RgbImage const& image, unsigned char* buffer, std::size_t size) const {
@@ -136,7 +151,8 @@ void PixelFormat::Store(YuvImage const& image, unsigned char* buffer, std::size_
     std::copy(image.bytes.begin(), image.bytes.end(), buffer);
 }
 
-YuvImage PixelFormat::ToYuv(RgbImage const& image) {
+YuvImage PixelFormat::ToYuv(RgbImage const& image, ColourRange range) {
+    Scales const& scales = ScalesOf(range);
     if (image.width < 0 || image.height < 0 ||
         image.pixels.size() != std::size_t(image.width) * std::size_t(image.height) * 3) {
         throw ToolError("the " + SizeText(image.width, image.height) + " picture holds " +
@@ -157,7 +173,7 @@ YuvImage PixelFormat::ToYuv(RgbImage const& image) {
         for (std::size_t column = 0; column < width; ++column) {
             uint8_t const* pixel = &image.pixels[(row * width + column) * 3];
             double const y = KR * pixel[0] + KG * pixel[1] + KB * pixel[2];
-            luma[row * width + column] = ToByte(LUMA_BLACK + LUMA_SCALE * y);
+            luma[row * width + column] = ToByte(scales.luma_black + scales.luma_scale * y);
         }
     }
     // The colour differences are linear in RGB, so those of the block's mean are the mean of the
@@ -182,14 +198,15 @@ YuvImage PixelFormat::ToYuv(RgbImage const& image) {
             double const b = sum[2] / count;
             double const y = KR * r + KG * g + KB * b;
             std::size_t const index = block_row * chroma_width + block_column;
-            u_plane[index] = ToByte(CHROMA_ZERO + CB_SCALE * (b - y));
-            v_plane[index] = ToByte(CHROMA_ZERO + CR_SCALE * (r - y));
+            u_plane[index] = ToByte(CHROMA_ZERO + scales.cb_scale * (b - y));
+            v_plane[index] = ToByte(CHROMA_ZERO + scales.cr_scale * (r - y));
         }
     }
     return yuv;
 }
 
-RgbImage PixelFormat::ToRgb(YuvImage const& yuv) {
+RgbImage PixelFormat::ToRgb(YuvImage const& yuv, ColourRange range) {
+    Scales const& scales = ScalesOf(range);
     RequireWhole(yuv);
     std::size_t const width = std::size_t(yuv.width);
     std::size_t const height = std::size_t(yuv.height);
@@ -205,9 +222,9 @@ RgbImage PixelFormat::ToRgb(YuvImage const& yuv) {
     for (std::size_t row = 0; row < height; ++row) {
         for (std::size_t column = 0; column < width; ++column) {
             std::size_t const chroma = (row / 2) * chroma_width + column / 2;
-            double const y = (luma[row * width + column] - LUMA_BLACK) / LUMA_SCALE;
-            double const b = y + (u_plane[chroma] - CHROMA_ZERO) / CB_SCALE;
-            double const r = y + (v_plane[chroma] - CHROMA_ZERO) / CR_SCALE;
+            double const y = (luma[row * width + column] - scales.luma_black) / scales.luma_scale;
+            double const b = y + (u_plane[chroma] - CHROMA_ZERO) / scales.cb_scale;
+            double const r = y + (v_plane[chroma] - CHROMA_ZERO) / scales.cr_scale;
             double const g = (y - KR * r - KB * b) / KG;
             uint8_t* pixel = &image.pixels[(row * width + column) * 3];
             pixel[0] = ToByte(r);

@@ -18,7 +18,9 @@ public:
     static constexpr int RGBX32 = 6;
     static constexpr int PLANAR_420 = 23;
 
-    explicit PixelFormat(int format);  // throws ToolError for a format the tool cannot convert
+    /// Throws ToolError for a format the tool cannot convert. `range` is the one of the 4:2:0
+    /// pictures that Encode and Decode convert to and from RGB.
+    explicit PixelFormat(int format, ColourRange range = ColourRange::LIMITED);
     PixelFormat(PixelFormat const&) = default;
     PixelFormat& operator=(PixelFormat const&) = default;
     virtual ~PixelFormat() = default;
@@ -32,11 +34,11 @@ public:
     RgbImage Decode(int width, int height, unsigned char const* buffer, std::size_t size) const;
     YuvImage DecodeYuv(int width, int height, unsigned char const* buffer, std::size_t size) const;
 
-    /// BT.601 limited range, the range of the plug-in's own black (luma 16, chroma 128) and of
-    /// ordinary 8-bit video. A chroma sample is the mean of the 2 x 2 pixels it covers, which puts
-    /// it at their centre.
-    static YuvImage ToYuv(RgbImage const& image);
-    static RgbImage ToRgb(YuvImage const& image);
+    /// BT.601, by default in limited range, the range of the plug-in's own black (luma 16,
+    /// chroma 128) and of ordinary 8-bit video; full range as a stream marked so carries it. A
+    /// chroma sample is the mean of the 2 x 2 pixels it covers, which puts it at their centre.
+    static YuvImage ToYuv(RgbImage const& image, ColourRange range = ColourRange::LIMITED);
+    static RgbImage ToRgb(YuvImage const& image, ColourRange range = ColourRange::LIMITED);
 
 private:
     bool IsPlanar420() const { return format == I420 || format == PLANAR_420; }
@@ -49,6 +51,7 @@ private:
     RgbImage Unpack(int width, int height, unsigned char const* buffer) const;
 
     int format;
+    ColourRange range;
 };
 
 }  // namespace vexmap_host

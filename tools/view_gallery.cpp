@@ -1,6 +1,6 @@
 // Renders every view kind of the engine from the built-in sample fisheye, for each mount, into
 // PNG files: a way to look at what the geometry does without a host. Usage:
-//   vexmap_view_gallery <output directory> [sample size]
+//   vexmap_view_gallery <output folder> [sample size]
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
@@ -8,9 +8,11 @@
 #include <string>
 #include <vector>
 
+#include <CLI/CLI.hpp>
 #include <boost/shared_ptr.hpp>
 
 #include "image_file.h"
+#include "picture_limits.h"
 #include "sample_scene.h"
 #include "tool_error.h"
 #include "vexmap/camera.h"
@@ -79,14 +81,38 @@ void Render(AbstractView& view, std::vector<uint32_t>& source, int source_size,
 }  // namespace
 
 int main(int argc, char** argv) {
-    if (argc < 2) {
-        std::fprintf(stderr, "usage: %s <output directory> [sample size]\n", argv[0]);
+    CLI::App app(
+        "Renders every view kind of the engine from the built-in sample fisheye, on each mount, "
+        "into PNG files.",
+        "vexmap_view_gallery");
+    app.footer("Exit status: 0 done, 1 the work failed, 2 usage error.");
+    std::string directory;
+    int size = 1024;
+    app.add_option("folder", directory, "folder for the pictures, made if it is missing")
+        ->required();
+    app.add_option("size", size, "side of the square sample picture, even (default: 1024)")
+        ->check(CLI::Range(2, int(vexmap_host::PictureLimits::MAX_SIDE)))
+        ->check(CLI::Validator(
+            [](std::string& text) {
+                return std::atoi(text.c_str()) % 2 == 0 ? std::string()
+                                                        : "the size must be even, not " + text;
+            },
+            "EVEN"));
+    try {
+        app.parse(argc, argv);
+    } catch (CLI::CallForHelp const& help) {
+        return app.exit(help);
+    } catch (CLI::ParseError const& error) {
+        std::fprintf(stderr, "vexmap_view_gallery: %s (see --help)\n", error.what());
         return 2;
     }
-    std::string const directory = argv[1];
-    int const size = argc > 2 ? std::atoi(argv[2]) : 1024;
     try {
-        std::filesystem::create_directories(directory);
+        std::error_code error;
+        std::filesystem::create_directories(directory, error);
+        if (error || !std::filesystem::is_directory(directory, error)) {
+            throw vexmap_host::ToolError("cannot make the folder " + directory + ": " +
+                                         (error ? error.message() : "a file has its name"));
+        }
         vexmap_host::SampleFisheye const sample = vexmap_host::MakeSampleFisheye(size);
         std::vector<uint32_t> source = ToWords(sample.image);
         _DEWARP_INTERNAL_CAMERA_MODEL const model = {DEWARP_INTERNAL_CAMERA_TYPE_CIRCULAR_FISHEYE,

@@ -17,10 +17,60 @@ constexpr std::size_t FRAME_MARK_LENGTH = sizeof FRAME_MARK - 1;
 // promises a huge frame costs memory only as its bytes really come.
 constexpr std::size_t READ_STEP = std::size_t(1) << 20;
 
-// Every 8-bit 4:2:0 layout. They differ only in where a chroma sample sits inside its 2 x 2 block,
-// a fraction of a pixel that a dewarped view does not keep anyway, so all are read alike.
-constexpr std::array<char const*, 4> ACCEPTED_COLOUR_SPACES{"420jpeg", "420mpeg2", "420paldv",
-                                                            "420"};
+struct ColourSpace {
+    char const* name;
+    ChromaLayout layout;
+    bool alpha;
+};
+
+// Every 8-bit layout. The 4:2:0 ones differ only in where a chroma sample sits inside its 2 x 2
+// block, a fraction of a pixel that a dewarped view does not keep anyway, so all are read alike.
+constexpr std::array<ColourSpace, 9> COLOUR_SPACES{{{"420jpeg", ChromaLayout::C420, false},
+                                                    {"420mpeg2", ChromaLayout::C420, false},
+                                                    {"420paldv", ChromaLayout::C420, false},
+                                                    {"420", ChromaLayout::C420, false},
+                                                    {"422", ChromaLayout::C422, false},
+                                                    {"444", ChromaLayout::C444, false},
+                                                    {"444alpha", ChromaLayout::C444, true},
+                                                    {"411", ChromaLayout::C411, false},
+                                                    {"mono", ChromaLayout::MONO, false}}};
+constexpr uint8_t NEUTRAL_CHROMA = 128;
+
+// The bits a sample of a deep colour space has: "420p10" and "mono16" give 10 and 16; 0 for
+// anything else.
+int BitsOf(std::string const& value) {
+    std::size_t const digits = value.find_last_not_of("0123456789") + 1;
+    if (digits == value.size() || digits == 0 || value.size() - digits > 2) {
+        return 0;
+    }
+    bool const deep =
+        value.compare(0, 4, "mono") == 0 ? digits == 4 : digits == 4 && value[3] == 'p';
+    return deep ? std::stoi(value.substr(digits)) : 0;
+}
+
+// Chroma plane sides of a layout, for a luma of `width` x `height`.
+uint64_t ChromaWidth(ChromaLayout layout, uint64_t width) {
+    switch (layout) {
+        case ChromaLayout::C420:
+        case ChromaLayout::C422:
+            return (width + 1) / 2;
+        case ChromaLayout::C444:
+            return width;
+        case ChromaLayout::C411:
+            return (width + 3) / 4;
+        default:
+            return 0;
+    }
+}
+
+uint64_t ChromaHeight(ChromaLayout layout, uint64_t height) {
+    return layout == ChromaLayout::C420 ? (height + 1) / 2 : height;
+}
+
+// The rounded mean of a 4:2:0 sample's sources, half up: what a box filter gives exactly.
+uint8_t Mean(unsigned sum, unsigned count) {
+    return uint8_t((sum + count / 2) / count);
+}
 
 // Decimal digits only, at most `limit`; anything else gives nothing.
 bool ParseCount(std::string const& text, long long limit, long long& value) {
@@ -55,7 +105,8 @@ bool ParseRatio(std::string const& text, int& numerator, int& denominator) {
 
 }  // namespace
 
-Y4mReader::Y4mReader(std::istream& source, std::string const& source_name)
+Y4mReader::Y4mReader(std::istream& source, std::string const& source_name,
+                     PictureLimits const& limits)
     : stream(source), name(source_name), header(), frame_bytes(0), frames_read(0) {
     std::array<char, MAGIC_LENGTH + 1> start{};
     stream.read(start.data(), std::streamsize(start.size()));
@@ -81,7 +132,11 @@ Y4mReader::Y4mReader(std::istream& source, std::string const& source_name)
         Fail(std::string("has no frame ") + (has_width ? "height (H)" : "width (W)") +
              " in its header");
     }
-    frame_bytes = YuvImage::FrameBytes(uint64_t(header.width), uint64_t(header.height));
+    limits.Check(name, uint64_t(header.width), uint64_t(header.height));
+    uint64_t const luma = uint64_t(header.width) * uint64_t(header.height);
+    frame_bytes =
+        luma * (header.alpha ? 2 : 1) + 2 * ChromaWidth(header.layout, uint64_t(header.width)) *
+                                            ChromaHeight(header.layout, uint64_t(header.height));
 }
 
 Y4mReader::~Y4mReader() = default;
@@ -122,16 +177,41 @@ void Y4mReader::ParseTag(std::string const& tag) {
             header.interlacing = value[0];
             break;
         case 'C':
-            if (std::find(ACCEPTED_COLOUR_SPACES.begin(), ACCEPTED_COLOUR_SPACES.end(), value) ==
-                ACCEPTED_COLOUR_SPACES.end()) {
-                Fail("has the colour space " + tag.substr(0, 32) +
-                     "; vexmap reads 8-bit 4:2:0 only (C420jpeg, C420mpeg2, C420paldv, C420)");
+            ParseColourSpace(tag);
+            break;
+        case 'X':
+            if (value == "COLORRANGE=FULL") {
+                header.range = ColourRange::FULL;
+            } else if (value == "COLORRANGE=LIMITED") {
+                header.range = ColourRange::LIMITED;
             }
-            header.colour_space = value;
             break;
         default:
             break;
     }
+}
+
+void Y4mReader::ParseColourSpace(std::string const& tag) {
+    std::string const value = tag.substr(1);
+    for (ColourSpace const& space : COLOUR_SPACES) {
+        if (value == space.name) {
+            header.colour_space = value;
+            header.layout = space.layout;
+            header.alpha = space.alpha;
+            return;
+        }
+    }
+    int const bits = BitsOf(value);
+    if (bits > 8) {
+        Fail("has the colour space " + tag.substr(0, 32) + ", " + std::to_string(bits) +
+             " bits a sample; vexmap reads 8-bit streams: convert with ffmpeg's -pix_fmt yuv420p");
+    }
+    std::string known;
+    for (ColourSpace const& space : COLOUR_SPACES) {
+        known += (known.empty() ? "C" : ", C") + std::string(space.name);
+    }
+    Fail("has the colour space " + tag.substr(0, 32) + ", which vexmap does not read (it reads " +
+         known + ")");
 }
 
 bool Y4mReader::ReadFrame(YuvImage& frame) {
@@ -149,22 +229,74 @@ bool Y4mReader::ReadFrame(YuvImage& frame) {
     }
     frame.width = header.width;
     frame.height = header.height;
+    if (header.layout == ChromaLayout::C420 && !header.alpha) {
+        ReadBytes(frame.bytes);
+    } else {
+        ReadBytes(raw);
+        ConvertRaw(frame);
+    }
+    ++frames_read;
+    return true;
+}
+
+void Y4mReader::ReadBytes(std::vector<uint8_t>& bytes) {
     std::size_t const total = std::size_t(frame_bytes);
     std::size_t filled = 0;
     while (filled < total) {
         std::size_t const step =
-            frame.bytes.capacity() >= total ? total - filled : std::min(total - filled, READ_STEP);
-        frame.bytes.resize(filled + step);
-        stream.read(reinterpret_cast<char*>(frame.bytes.data() + filled), std::streamsize(step));
+            bytes.capacity() >= total ? total - filled : std::min(total - filled, READ_STEP);
+        bytes.resize(filled + step);
+        stream.read(reinterpret_cast<char*>(bytes.data() + filled), std::streamsize(step));
         filled += std::size_t(stream.gcount());
-        if (filled < frame.bytes.size()) {
+        if (filled < bytes.size()) {
             Fail("ends inside frame " + std::to_string(frames_read + 1) + ", after " +
                  std::to_string(filled) + " of its " + std::to_string(total) + " bytes");
         }
     }
-    frame.bytes.resize(total);
-    ++frames_read;
-    return true;
+    bytes.resize(total);
+}
+
+// Each 4:2:0 sample covers the pixels of rows 2r and 2r + 1 and columns 2c and 2c + 1 (fewer on an
+// odd edge) and is the mean of the samples that cover those pixels in the stream's layout.
+void Y4mReader::ConvertRaw(YuvImage& frame) const {
+    std::size_t const width = std::size_t(header.width);
+    std::size_t const height = std::size_t(header.height);
+    std::size_t const luma = width * height;
+    std::size_t const out_width = YuvImage::ChromaWidth(width);
+    std::size_t const out_height = YuvImage::ChromaHeight(height);
+    frame.bytes.resize(YuvImage::FrameBytes(width, height));
+    std::copy_n(raw.data(), luma, frame.bytes.data());
+    std::size_t const in_width = std::size_t(ChromaWidth(header.layout, width));
+    std::size_t const in_height = std::size_t(ChromaHeight(header.layout, height));
+    for (std::size_t plane = 0; plane < 2; ++plane) {
+        uint8_t* out = frame.bytes.data() + luma + plane * out_width * out_height;
+        if (header.layout == ChromaLayout::MONO) {
+            std::fill_n(out, out_width * out_height, NEUTRAL_CHROMA);
+            continue;
+        }
+        uint8_t const* in = raw.data() + luma + plane * in_width * in_height;
+        for (std::size_t row = 0; row < out_height; ++row) {
+            std::size_t const last_row = std::min(2 * row + 1, height - 1);
+            for (std::size_t column = 0; column < out_width; ++column) {
+                std::size_t const last_column = std::min(2 * column + 1, width - 1);
+                unsigned sum = 0;
+                unsigned count = 0;
+                for (std::size_t y = 2 * row; y <= last_row; ++y) {
+                    // 4:2:2 and 4:1:1 keep one sample across the pair of columns; 4:4:4 has both.
+                    std::size_t const first = header.layout == ChromaLayout::C444   ? 2 * column
+                                              : header.layout == ChromaLayout::C422 ? column
+                                                                                    : column / 2;
+                    std::size_t const last =
+                        header.layout == ChromaLayout::C444 ? last_column : first;
+                    for (std::size_t x = first; x <= last; ++x) {
+                        sum += in[y * in_width + x];
+                        ++count;
+                    }
+                }
+                out[row * out_width + column] = Mean(sum, count);
+            }
+        }
+    }
 }
 
 // A line without its newline. The limit counts the newline, and a line that reaches it unended

@@ -12,11 +12,12 @@ std::string SizeText(int width, int height) {
 }  // namespace
 
 Y4mWriter::Y4mWriter(std::ostream& destination, std::string const& destination_name, int numerator,
-                     int denominator)
+                     int denominator, ColourRange colour_range)
     : stream(destination),
       name(destination_name),
       rate_numerator(numerator),
       rate_denominator(denominator),
+      range(colour_range),
       width(0),
       height(0),
       frames_written(0) {
@@ -40,7 +41,11 @@ void Y4mWriter::WriteFrame(YuvImage const& frame) {
         width = frame.width;
         height = frame.height;
         stream << "YUV4MPEG2 W" << width << " H" << height << " F" << rate_numerator << ":"
-               << rate_denominator << " Ip A1:1 C420jpeg\n";
+               << rate_denominator << " Ip A1:1 C420jpeg";
+        if (range != ColourRange::UNSPECIFIED) {
+            stream << (range == ColourRange::FULL ? " XCOLORRANGE=FULL" : " XCOLORRANGE=LIMITED");
+        }
+        stream << "\n";
     } else if (frame.width != width || frame.height != height) {
         throw ToolError("cannot write a " + SizeText(frame.width, frame.height) + " frame to " +
                         name + ", a stream of " + SizeText(width, height) + " frames");

@@ -5,6 +5,10 @@
 
 namespace vexmap_host {
 
+/// How 8-bit YCbCr values span their byte: limited (video) range puts black at luma 16 and white
+/// at 235, full range at 0 and 255. Unspecified streams are read as limited, as video players do.
+enum class ColourRange { UNSPECIFIED, LIMITED, FULL };
+
 /// A picture as a YUV4MPEG2 stream carries it: 8-bit planar 4:2:0, the luma plane, then U, then V,
 /// each row after row with no padding. A chroma sample covers 2 x 2 pixels, so a chroma plane is
 /// half the size rounded up: an odd width or height keeps its last column or row.

@@ -111,7 +111,7 @@ TEST_F(DewarpSessionTest, HoldsADewarperOfTheAskedMode) {
 
 TEST_F(DewarpSessionTest, PtzViewKeepsAWishThatIsAlreadyAligned) {
     DewarpSession const session(host, SENTRY360, CeilingCamera());
-    RgbImage const view = session.Render(PTZ, {}, Disc(SIZE), 960, 540, 2);
+    RgbImage const view = session.Render(PTZ, {}, Disc(SIZE), 960, 540, 2).picture;
     EXPECT_EQ(960, view.width);
     EXPECT_EQ(540, view.height);
     EXPECT_EQ(std::size_t(960) * 540 * 3, view.pixels.size());
@@ -119,7 +119,7 @@ TEST_F(DewarpSessionTest, PtzViewKeepsAWishThatIsAlreadyAligned) {
 
 TEST_F(DewarpSessionTest, PtzViewRoundsTheWidthToEightAndTheHeightToEven) {
     DewarpSession const session(host, SENTRY360, CeilingCamera());
-    RgbImage const view = session.Render(PTZ, {}, Disc(SIZE), 641, 361, 2);
+    RgbImage const view = session.Render(PTZ, {}, Disc(SIZE), 641, 361, 2).picture;
     EXPECT_EQ(648, view.width);
     EXPECT_EQ(362, view.height);
     EXPECT_EQ(std::size_t(648) * 362 * 3, view.pixels.size());
@@ -128,7 +128,7 @@ TEST_F(DewarpSessionTest, PtzViewRoundsTheWidthToEightAndTheHeightToEven) {
 // One frame only: a new view samples the nearest pixel, so no blending can shade the colour.
 TEST_F(DewarpSessionTest, PtzViewInsideAUniformDiscIsThatColourThroughout) {
     DewarpSession const session(host, SENTRY360, CeilingCamera());
-    RgbImage const view = session.Render(PTZ, {}, Disc(SIZE), 320, 180, 1);
+    RgbImage const view = session.Render(PTZ, {}, Disc(SIZE), 320, 180, 1).picture;
     ASSERT_EQ(std::size_t(320) * 180 * 3, view.pixels.size());
     for (int row = 0; row < view.height; ++row) {
         for (int column = 0; column < view.width; ++column) {
@@ -139,7 +139,7 @@ TEST_F(DewarpSessionTest, PtzViewInsideAUniformDiscIsThatColourThroughout) {
 
 TEST_F(DewarpSessionTest, PanoramaIsHalfTheInputWhateverTheWish) {
     DewarpSession const session(host, SENTRY360, CeilingCamera());
-    RgbImage const view = session.Render(PANORAMA, {}, Disc(SIZE), 960, 540, 2);
+    RgbImage const view = session.Render(PANORAMA, {}, Disc(SIZE), 960, 540, 2).picture;
     EXPECT_EQ(128, view.width);
     EXPECT_EQ(128, view.height);
     ASSERT_EQ(std::size_t(128) * 128 * 3, view.pixels.size());
@@ -149,9 +149,9 @@ TEST_F(DewarpSessionTest, PanoramaIsHalfTheInputWhateverTheWish) {
 TEST_F(DewarpSessionTest, OneSessionRendersBothViewsInTurn) {
     DewarpSession const session(host, SENTRY360, CeilingCamera());
     RgbImage const input = Disc(SIZE);
-    EXPECT_EQ(960, session.Render(PTZ, {}, input, 960, 540, 1).width);
-    EXPECT_EQ(128, session.Render(PANORAMA, {}, input, 960, 540, 1).width);
-    RgbImage const again = session.Render(PTZ, {}, input, 960, 540, 1);
+    EXPECT_EQ(960, session.Render(PTZ, {}, input, 960, 540, 1).picture.width);
+    EXPECT_EQ(128, session.Render(PANORAMA, {}, input, 960, 540, 1).picture.width);
+    RgbImage const again = session.Render(PTZ, {}, input, 960, 540, 1).picture;
     EXPECT_EQ(960, again.width);
     EXPECT_EQ(540, again.height);
 }
@@ -197,7 +197,7 @@ TEST_F(DewarpSessionTest, TurningThePanShowsAnotherPartOfTheCircle) {
         RequestedPosition position;
         position.pan = pan;
         position.tilt = 45.0f;
-        RgbImage const view = session.Render(PTZ, position, input, 64, 64, 1);
+        RgbImage const view = session.Render(PTZ, position, input, 64, 64, 1).picture;
         Colour const centre = PixelAt(view, 32, 32);
         EXPECT_NE(SECTORS.end(), std::find(SECTORS.begin(), SECTORS.end(), centre))
             << "pan " << pan;
@@ -211,9 +211,11 @@ YuvImage UniformYuv(int size, uint8_t y, uint8_t u, uint8_t v) {
     image.width = size;
     image.height = size;
     std::size_t const pixels = std::size_t(size) * std::size_t(size);
+    std::size_t const chroma =
+        YuvImage::ChromaWidth(std::size_t(size)) * YuvImage::ChromaHeight(std::size_t(size));
     image.bytes.assign(pixels, y);
-    image.bytes.insert(image.bytes.end(), pixels / 4, u);
-    image.bytes.insert(image.bytes.end(), pixels / 4, v);
+    image.bytes.insert(image.bytes.end(), chroma, u);
+    image.bytes.insert(image.bytes.end(), chroma, v);
     return image;
 }
 
@@ -269,6 +271,116 @@ TEST_F(DewarpSessionTest, AimedSubModeHoldsForTheFramesThatFollow) {
         EXPECT_EQ(128, view.height);
     }
     EXPECT_EQ(PANORAMA, session.Get().SubMode());
+}
+
+TEST_F(DewarpSessionTest, RenderTellsThePositionInForceAfterTheFirstFrame) {
+    DewarpSession const session(host, IN_HOUSE, CeilingCamera());
+    RequestedPosition position;
+    position.pan = 400.0f;  // wraps into 0 to 360
+    position.zoom = 50.0f;  // beyond the kind's 10
+    RenderedView<RgbImage> const view = session.Render(PTZ, position, Disc(SIZE), 320, 180, 1);
+    EXPECT_NEAR(40.0f, view.position.pan, 1e-3f);
+    EXPECT_FLOAT_EQ(10.0f, view.position.zoom);
+}
+
+TEST_F(DewarpSessionTest, RenderHearsOfEveryFrameDone) {
+    DewarpSession const session(host, IN_HOUSE, CeilingCamera());
+    std::vector<int> done;
+    session.Render(PTZ, {}, Disc(SIZE), 320, 180, 4,
+                   [&done](int frames) { done.push_back(frames); });
+    EXPECT_EQ((std::vector<int>{1, 2, 3, 4}), done);
+}
+
+// The still is converted once and copied in for each later frame: the last frame must show what
+// frames converted one by one show, for a kind that converts (RGB into 4:2:0) and one that does
+// not.
+TEST_F(DewarpSessionTest, ManyFramesOfAStillShowWhatFramesConvertedOneByOneShow) {
+    for (int const mode : {IN_HOUSE, SENTRY360}) {
+        DewarpSession const by_frame(host, mode, CeilingCamera());
+        DewarpSession const at_once(host, mode, CeilingCamera());
+        RgbImage const input = Sectors(SIZE);
+        by_frame.Aim(PTZ, {});
+        RgbImage expected;
+        for (int frame = 0; frame < 3; ++frame) {
+            expected = by_frame.RunFrame(input, 320, 180);
+        }
+        RgbImage const last = at_once.Render(PTZ, {}, input, 320, 180, 3).picture;
+        EXPECT_EQ(expected.pixels, last.pixels) << "mode " << mode;
+    }
+}
+
+TEST_F(DewarpSessionTest, FourTwoZeroKindTakesOddSizesGrownByOneColumnAndRow) {
+    DewarpSession const session(host, IN_HOUSE, CeilingCamera());
+    FrameSize const fed = session.FedSize(255, 127);
+    EXPECT_EQ(256, fed.width);
+    EXPECT_EQ(128, fed.height);
+    RgbImage odd = Disc(SIZE);
+    odd.width = SIZE - 1;
+    odd.pixels.resize(std::size_t(odd.width) * SIZE * 3);
+    RgbImage const view = session.Render(PTZ, {}, odd, 320, 180, 1).picture;
+    EXPECT_EQ(320, view.width);
+}
+
+TEST_F(DewarpSessionTest, RgbKindTakesOddSizesAsTheyAre) {
+    DewarpSession const session(host, SENTRY360, CeilingCamera());
+    FrameSize const fed = session.FedSize(255, 127);
+    EXPECT_EQ(255, fed.width);
+    EXPECT_EQ(127, fed.height);
+}
+
+// A frame whose every byte differs from its neighbours, so that a padding of anything but copies
+// of the last column and row shows in the view.
+YuvImage Numbered(int width, int height) {
+    YuvImage image;
+    image.width = width;
+    image.height = height;
+    image.bytes.resize(YuvImage::FrameBytes(std::size_t(width), std::size_t(height)));
+    for (std::size_t index = 0; index < image.bytes.size(); ++index) {
+        image.bytes[index] = uint8_t(index * 7 % 251);
+    }
+    return image;
+}
+
+// The odd frame the dewarper is fed is the one a host would make by repeating the last column
+// and row: its view is that of such a frame, made here by hand.
+TEST_F(DewarpSessionTest, OddFrameIsGrownByCopiesOfItsLastColumnAndRow) {
+    int const odd = SIZE - 1;
+    YuvImage const input = Numbered(odd, odd);
+    YuvImage grown = Numbered(SIZE, SIZE);
+    for (int row = 0; row < SIZE; ++row) {
+        for (int column = 0; column < SIZE; ++column) {
+            grown.bytes[std::size_t(row * SIZE + column)] =
+                input.bytes[std::size_t(std::min(row, odd - 1) * odd + std::min(column, odd - 1))];
+        }
+    }
+    std::size_t const chroma = 2 * YuvImage::ChromaWidth(odd) * YuvImage::ChromaHeight(odd);
+    std::copy_n(input.bytes.end() - std::ptrdiff_t(chroma), chroma,
+                grown.bytes.end() - std::ptrdiff_t(chroma));
+    DewarpSession const padded(host, IN_HOUSE, CeilingCamera());
+    DewarpSession const by_hand(host, IN_HOUSE, CeilingCamera());
+    for (int const sub_mode : {PTZ, PANORAMA}) {
+        padded.Aim(sub_mode, {});
+        by_hand.Aim(sub_mode, {});
+        YuvImage from_padded;
+        YuvImage from_hand;
+        padded.RunFrame(input, 640, 320, from_padded);
+        by_hand.RunFrame(grown, 640, 320, from_hand);
+        EXPECT_EQ(from_hand.bytes, from_padded.bytes) << "sub-mode " << sub_mode;
+    }
+}
+
+TEST_F(DewarpSessionTest, FramesIntoOneViewReuseItsStorage) {
+    DewarpSession const session(host, IN_HOUSE, CeilingCamera());
+    YuvImage const input = UniformYuv(SIZE, 100, 90, 200);
+    YuvImage view;
+    session.RunFrame(input, 320, 180, view);
+    uint8_t const* const storage = view.bytes.data();
+    std::size_t const capacity = view.bytes.capacity();
+    for (int frame = 0; frame < 3; ++frame) {
+        session.RunFrame(input, 320, 180, view);
+        EXPECT_EQ(storage, view.bytes.data());
+        EXPECT_EQ(capacity, view.bytes.capacity());
+    }
 }
 
 TEST_F(DewarpSessionTest, RefusesAnUnregisteredMode) {
