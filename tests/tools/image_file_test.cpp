@@ -1,5 +1,6 @@
 #include "image_file.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdlib>
 #include <filesystem>
@@ -13,6 +14,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "crafted_pictures.h"
 #include "tool_error.h"
 
 namespace vexmap_host {
@@ -186,6 +188,79 @@ TEST_F(ImageFileTest, WritingIntoAMissingDirectoryNamesThePath) {
     std::string const path = PathOf("absent/picture.png");
     EXPECT_THAT([&] { WritePng(path, Gradient(4, 4)); },
                 ThrowsMessage<ToolError>(HasSubstr("cannot write " + path)));
+}
+
+TEST_F(ImageFileTest, JpegHeaderClaimingAHugePictureIsRefusedBeforeDecoding) {
+    std::string const path = PathOf("huge.jpg");
+    CraftedPictures::Write(path, CraftedPictures::Jpeg(PathOf("scratch.jpg"), 60000, 60000));
+    EXPECT_THAT([&] { ReadImage(path); },
+                ThrowsMessage<ToolError>(
+                    path + " is 60000x60000, beyond the limit of 16384 pixels a side"));
+}
+
+TEST_F(ImageFileTest, PngHeaderClaimingAHugePictureIsRefusedBeforeDecoding) {
+    std::string const path = PathOf("huge.png");
+    CraftedPictures::Write(path, CraftedPictures::Png(PathOf("scratch.png"), 100000, 100000));
+    EXPECT_THAT([&] { ReadImage(path); },
+                ThrowsMessage<ToolError>(
+                    path + " is 100000x100000, beyond the limit of 16384 pixels a side"));
+}
+
+TEST_F(ImageFileTest, PictureBeyondTheChosenPixelLimitIsRefused) {
+    std::string const path = PathOf("small.png");
+    CraftedPictures::Write(path, CraftedPictures::Png(PathOf("scratch.png"), 8, 8));
+    EXPECT_EQ(8, ReadImage(path, PictureLimits(64)).width);
+    EXPECT_THAT([&] { ReadImage(path, PictureLimits(63)); },
+                ThrowsMessage<ToolError>(HasSubstr("beyond the limit of 63 pixels")));
+}
+
+TEST_F(ImageFileTest, FolderIsRefusedWithTheSystemsReason) {
+    std::filesystem::create_directories(directory / "folder.png");
+    std::string const path = PathOf("folder.png");
+    EXPECT_THAT([&] { ReadImage(path); },
+                ThrowsMessage<ToolError>("cannot read " + path + ": it is a directory"));
+}
+
+TEST_F(ImageFileTest, WritesAJpegThatReadsBackCloseToThePicture) {
+    RgbImage picture;
+    picture.width = 64;
+    picture.height = 32;
+    for (int index = 0; index < 64 * 32; ++index) {
+        picture.pixels.insert(picture.pixels.end(),
+                              {uint8_t(index % 64 * 4), uint8_t(index / 64 * 8), 100});
+    }
+    std::string const path = PathOf("view.JPEG");
+    WritePicture(path, path, picture);
+    RgbImage const back = ReadImage(path);
+    ASSERT_EQ(64, back.width);
+    ASSERT_EQ(32, back.height);
+    int worst = 0;
+    for (std::size_t index = 0; index < back.pixels.size(); ++index) {
+        worst = std::max(worst, std::abs(int(back.pixels[index]) - int(picture.pixels[index])));
+    }
+    EXPECT_LE(worst, 8);
+}
+
+TEST_F(ImageFileTest, WritesTheFormatOfTheNameIntoAnyPath) {
+    RgbImage picture;
+    picture.width = 8;
+    picture.height = 8;
+    picture.pixels.assign(8 * 8 * 3, 50);
+    std::string const temporary = PathOf(".view.png.tmp");
+    WritePicture(temporary, "view.png", picture);
+    std::ifstream file(temporary, std::ios::binary);
+    char start[4] = {};
+    file.read(start, 4);
+    EXPECT_EQ(std::string("\x89PNG"), std::string(start, 4));
+}
+
+TEST_F(ImageFileTest, KnowsTheExtensionsItWrites) {
+    EXPECT_TRUE(IsPictureExtension("a/b.png"));
+    EXPECT_TRUE(IsPictureExtension("b.JPG"));
+    EXPECT_TRUE(IsPictureExtension("b.jpeg"));
+    EXPECT_FALSE(IsPictureExtension("b.bmp"));
+    EXPECT_FALSE(IsPictureExtension("b.png/c"));
+    EXPECT_FALSE(IsPictureExtension(".png"));
 }
 
 }  // namespace

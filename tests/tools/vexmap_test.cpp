@@ -3,6 +3,7 @@
 #include <csignal>
 #include <cstdint>
 #include <cstdlib>
+#include <cstring>
 #include <fcntl.h>
 #include <filesystem>
 #include <fstream>
@@ -19,6 +20,7 @@
 #include <gtest/gtest.h>
 #include <sys/wait.h>
 
+#include "crafted_pictures.h"
 #include "image_file.h"
 #include "pixel_format.h"
 #include "rgb_image.h"
@@ -1218,6 +1220,122 @@ TEST_F(VexmapTest, ListSaysWhenALibraryLoadsButLacksWhatThePluginCalls) {
     EXPECT_THAT(outcome.out, HasSubstr("   3 Vivotek      no     yes    yes       not available: "
                                        "its library libfisheyesw.so.3 loads but lacks what the "
                                        "plug-in calls\n"));
+}
+
+#if defined(__SANITIZE_ADDRESS__)
+constexpr bool ADDRESS_SANITIZED = true;
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+constexpr bool ADDRESS_SANITIZED = true;
+#else
+constexpr bool ADDRESS_SANITIZED = false;
+#endif
+#else
+constexpr bool ADDRESS_SANITIZED = false;
+#endif
+
+class VexmapCraftedHeaderTest : public VexmapTest,
+                                public ::testing::WithParamInterface<char const*> {
+protected:
+    // The tool with at most 1 GiB of address space. AddressSanitizer reserves terabytes of it for
+    // itself, so there the bound is its own largest allocation instead.
+    Outcome RunBounded(std::vector<std::string> arguments) {
+        if (ADDRESS_SANITIZED) {
+            added_environment = {
+                "ASAN_OPTIONS=max_allocation_size_mb=1024:"
+                "allocator_may_return_null=0"};
+            return Run(std::move(arguments));
+        }
+        arguments.insert(arguments.begin(),
+                         {"-c", "ulimit -v 1048576 && exec \"$0\" \"$@\"", VEXMAP_TOOL_PATH});
+        return RunProgram("/bin/sh", std::move(arguments));
+    }
+};
+
+TEST_P(VexmapCraftedHeaderTest, PictureClaimingGigabytesIsRefusedAtItsHeader) {
+    std::string const name = GetParam();
+    std::string const input = PathOf("crafted." + name);
+    std::vector<unsigned char> const bytes =
+        name == "jpg" ? CraftedPictures::Jpeg(PathOf("scratch.jpg"), 60000, 60000)
+                      : CraftedPictures::Png(PathOf("scratch.png"), 100000, 100000);
+    CraftedPictures::Write(input, bytes);
+    EXPECT_LT(bytes.size(), 1000u);
+    Outcome const outcome = RunBounded({"--input", input, "--output", PathOf("views")});
+    std::string const size = name == "jpg" ? "60000x60000" : "100000x100000";
+    ExpectCleanRefusal(outcome, RUNTIME_FAILURE,
+                       input + " is " + size + ", beyond the limit of 16384 pixels a side");
+    EXPECT_FALSE(std::filesystem::exists(directory / "views"));
+}
+
+TEST_P(VexmapCraftedHeaderTest, PictureWithinTheSideButBeyondThePixelsIsRefused) {
+    std::string const name = GetParam();
+    std::string const input = PathOf("crafted." + name);
+    CraftedPictures::Write(input, name == "jpg"
+                                      ? CraftedPictures::Jpeg(PathOf("scratch.jpg"), 16000, 16000)
+                                      : CraftedPictures::Png(PathOf("scratch.png"), 16000, 16000));
+    Outcome const outcome =
+        RunBounded({"--input", input, "--max-pixels", "100000000", "--output", PathOf("views")});
+    ExpectCleanRefusal(outcome, RUNTIME_FAILURE,
+                       input +
+                           " is 16000x16000, 256000000 pixels, beyond the limit of 100000000 "
+                           "pixels (--max-pixels)");
+}
+
+INSTANTIATE_TEST_SUITE_P(Formats, VexmapCraftedHeaderTest, ::testing::Values("jpg", "png"));
+
+// The tool with its standard error on a terminal, as a user at a shell sees it.
+Outcome RunOnTerminal(std::vector<std::string> arguments, std::string const& out_path) {
+    int const terminal = posix_openpt(O_RDWR | O_NOCTTY);
+    if (terminal < 0 || grantpt(terminal) != 0 || unlockpt(terminal) != 0) {
+        ADD_FAILURE() << "no pseudo-terminal: " << strerror(errno);
+        return Outcome();
+    }
+    std::string const side = ptsname(terminal);
+    posix_spawn_file_actions_t actions;
+    posix_spawn_file_actions_init(&actions);
+    posix_spawn_file_actions_addopen(&actions, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
+    posix_spawn_file_actions_addopen(&actions, STDOUT_FILENO, out_path.c_str(),
+                                     O_WRONLY | O_CREAT | O_TRUNC, 0644);
+    posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, side.c_str(), O_RDWR | O_NOCTTY, 0);
+    pid_t const child = Start(std::move(arguments), actions);
+    posix_spawn_file_actions_destroy(&actions);
+    std::string shown;
+    char chunk[4096];
+    // The terminal holds a few kilobytes: read while the tool runs, until its side is closed.
+    for (ssize_t got = read(terminal, chunk, sizeof chunk); got > 0;
+         got = read(terminal, chunk, sizeof chunk)) {
+        shown.append(chunk, std::size_t(got));
+    }
+    close(terminal);
+    Outcome outcome = Wait(child);
+    outcome.err = shown;
+    return outcome;
+}
+
+TEST_F(VexmapTest, FramesOfAStillShowProgressOnATerminal) {
+    Outcome const outcome = RunOnTerminal(
+        {"--frames", "30", "--submode", "1", "--output", PathOf("view.png")}, PathOf("stdout.txt"));
+    ASSERT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_THAT(outcome.err, HasSubstr("\rframe 30, "));
+    EXPECT_THAT(outcome.err, HasSubstr(" fps, 100%, 0:00 left"));
+}
+
+TEST_F(VexmapTest, StreamFileShowsItsShareAndTimeLeftOnATerminal) {
+    std::string const input = PathOf("in.y4m");
+    WriteText(input, StreamOf({SampleFrame(512), SampleFrame(512), SampleFrame(512)}));
+    Outcome const outcome =
+        RunOnTerminal({"--input", input, "--output", PathOf("out.y4m")}, PathOf("stdout.txt"));
+    ASSERT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_THAT(outcome.err, HasSubstr("\rframe 3, "));
+    EXPECT_THAT(outcome.err, HasSubstr("100%, 0:00 left"));
+}
+
+TEST_F(VexmapTest, QuietShowsNoProgressEvenOnATerminal) {
+    Outcome const outcome = RunOnTerminal(
+        {"--quiet", "--frames", "5", "--submode", "1", "--output", PathOf("view.png")},
+        PathOf("stdout.txt"));
+    ASSERT_EQ(0, outcome.status) << outcome.err;
+    EXPECT_EQ("", outcome.err);
 }
 
 TEST_F(VexmapTest, ViewGalleryHelpIsHelpNotAFolder) {

@@ -1,0 +1,138 @@
+#include "output_file.h"
+
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <string>
+#include <unistd.h>
+#include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include "tool_error.h"
+
+namespace vexmap_host {
+namespace {
+
+using ::testing::HasSubstr;
+using ::testing::StartsWith;
+using ::testing::ThrowsMessage;
+
+class OutputFileTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        directory = std::filesystem::path(::testing::TempDir()) /
+                    ("vexmap-output-file-" +
+                     std::string(::testing::UnitTest::GetInstance()->current_test_info()->name()) +
+                     "-" + std::to_string(getpid()));
+        std::filesystem::remove_all(directory);
+        std::filesystem::create_directories(directory);
+    }
+    void TearDown() override { std::filesystem::remove_all(directory); }
+
+    std::string PathOf(std::string const& name) const { return (directory / name).string(); }
+
+    std::vector<std::string> Names() const {
+        std::vector<std::string> names;
+        for (auto const& entry : std::filesystem::directory_iterator(directory)) {
+            names.push_back(entry.path().filename().string());
+        }
+        std::sort(names.begin(), names.end());
+        return names;
+    }
+
+    static std::string Text(std::string const& path) {
+        std::ifstream file(path, std::ios::binary);
+        return std::string((std::istreambuf_iterator<char>(file)),
+                           std::istreambuf_iterator<char>());
+    }
+
+    std::filesystem::path directory;
+};
+
+TEST_F(OutputFileTest, AppearsAtItsPathOnlyOnCommit) {
+    std::string const path = PathOf("view.png");
+    OutputFile file(path);
+    EXPECT_NE(path, file.Path());
+    std::ofstream(file.Path()) << "picture";
+    EXPECT_FALSE(std::filesystem::exists(path));
+    file.Commit();
+    EXPECT_EQ("picture", Text(path));
+    EXPECT_EQ(std::vector<std::string>{"view.png"}, Names());
+}
+
+TEST_F(OutputFileTest, WithoutCommitLeavesNothingBehind) {
+    {
+        OutputFile file(PathOf("view.png"));
+        std::ofstream(file.Path()) << "half a picture";
+        EXPECT_EQ(1u, Names().size());  // the hidden file being written
+    }
+    EXPECT_EQ(std::vector<std::string>{}, Names());
+}
+
+TEST_F(OutputFileTest, OlderFileStaysUntilTheNewOneIsWhole) {
+    std::string const path = PathOf("view.png");
+    std::ofstream(path) << "old";
+    {
+        OutputFile file(path);
+        std::ofstream(file.Path()) << "new";
+        EXPECT_EQ("old", Text(path));
+    }
+    EXPECT_EQ("old", Text(path));
+    OutputFile file(path);
+    std::ofstream(file.Path()) << "new";
+    file.Commit();
+    EXPECT_EQ("new", Text(path));
+}
+
+TEST_F(OutputFileTest, UnwritablePlaceFailsAtOnceNamingThePath) {
+    std::ofstream(PathOf("plain.txt")) << "a file";
+    std::string const below_a_file = PathOf("plain.txt/view.png");
+    EXPECT_THAT([&] { OutputFile file(below_a_file); },
+                ThrowsMessage<ToolError>("cannot write " + below_a_file + ": Not a directory"));
+    std::string const in_missing = PathOf("missing/view.png");
+    EXPECT_THAT([&] { OutputFile file(in_missing); },
+                ThrowsMessage<ToolError>(HasSubstr(in_missing + ": No such file or directory")));
+}
+
+TEST_F(OutputFileTest, ExistingFolderAtThePathIsRefused) {
+    std::filesystem::create_directories(directory / "view.png");
+    EXPECT_THAT([&] { OutputFile file(PathOf("view.png")); },
+                ThrowsMessage<ToolError>(HasSubstr("view.png: it is a directory")));
+}
+
+TEST_F(OutputFileTest, NewFileGetsThePermissionsOfAnyNewFile) {
+    mode_t const previous = umask(022);
+    OutputFile file(PathOf("view.png"));
+    file.Commit();
+    umask(previous);
+    struct stat status = {};
+    ASSERT_EQ(0, stat(PathOf("view.png").c_str(), &status));
+    EXPECT_EQ(mode_t(0644), status.st_mode & 0777);
+}
+
+TEST_F(OutputFileTest, DeviceIsWrittenInPlace) {
+    OutputFile file("/dev/null");
+    EXPECT_EQ("/dev/null", file.Path());
+    file.Commit();
+    EXPECT_TRUE(OutputFile::IsDevice("/dev/null"));
+    EXPECT_FALSE(OutputFile::IsDevice(PathOf("absent")));
+}
+
+TEST_F(OutputFileTest, SameFileSeesThroughLinksAndDots) {
+    std::filesystem::create_directories(directory / "a");
+    std::string const path = PathOf("a/x.png");
+    std::ofstream(path) << "x";
+    std::filesystem::create_symlink(path, directory / "link.png");
+    EXPECT_TRUE(OutputFile::SameFile(path, PathOf("a/../a/x.png")));
+    EXPECT_TRUE(OutputFile::SameFile(path, PathOf("link.png")));
+    std::ofstream(PathOf("a/y.png")) << "x";
+    EXPECT_FALSE(OutputFile::SameFile(path, PathOf("a/y.png")));
+    EXPECT_FALSE(OutputFile::SameFile(path, PathOf("absent.png")));
+}
+
+}  // namespace
+}  // namespace vexmap_host
