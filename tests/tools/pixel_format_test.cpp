@@ -383,5 +383,66 @@ TEST_P(PixelFormatTest, RefusesAFormatItCannotConvertNamingIt) {
 
 INSTANTIATE_TEST_SUITE_P(UnknownFormats, PixelFormatTest, ::testing::Values(1, 2, 7, 22, 24, -1));
 
+RgbImage OnePixelPicture(uint8_t red, uint8_t green, uint8_t blue) {
+    RgbImage image;
+    image.width = 2;
+    image.height = 2;
+    for (int pixel = 0; pixel < 4; ++pixel) {
+        image.pixels.insert(image.pixels.end(), {red, green, blue});
+    }
+    return image;
+}
+
+// Full range: Y' = 0.299 R + 0.587 G + 0.114 B, Cb = 128 + (B - Y') / 1.772,
+// Cr = 128 + (R - Y') / 1.402, over the whole byte.
+TEST(PixelFormat, FullRangeGivesTheWholeByteValuesOfBt601) {
+    struct Case {
+        std::array<uint8_t, 3> rgb;
+        std::array<uint8_t, 3> yuv;
+    };
+    for (Case const& item : {Case{{255, 0, 0}, {76, 85, 255}}, Case{{0, 0, 255}, {29, 255, 107}},
+                             Case{{255, 255, 255}, {255, 128, 128}}, Case{{0, 0, 0}, {0, 128, 128}},
+                             Case{{128, 128, 128}, {128, 128, 128}}}) {
+        YuvImage const yuv = PixelFormat::ToYuv(
+            OnePixelPicture(item.rgb[0], item.rgb[1], item.rgb[2]), ColourRange::FULL);
+        EXPECT_EQ(item.yuv[0], yuv.bytes[0]) << int(item.rgb[0]) << " " << int(item.rgb[2]);
+        EXPECT_EQ(item.yuv[1], yuv.bytes[4]) << int(item.rgb[0]) << " " << int(item.rgb[2]);
+        EXPECT_EQ(item.yuv[2], yuv.bytes[5]) << int(item.rgb[0]) << " " << int(item.rgb[2]);
+    }
+}
+
+TEST(PixelFormat, FullRangeRoundTripStaysWithinOne) {
+    for (int value = 0; value < 256; value += 5) {
+        RgbImage const picture =
+            OnePixelPicture(uint8_t(value), uint8_t(255 - value), uint8_t(value / 2));
+        RgbImage const back =
+            PixelFormat::ToRgb(PixelFormat::ToYuv(picture, ColourRange::FULL), ColourRange::FULL);
+        for (std::size_t channel = 0; channel < 3; ++channel) {
+            EXPECT_NEAR(picture.pixels[channel], back.pixels[channel], 1) << value;
+        }
+    }
+}
+
+TEST(PixelFormat, UnspecifiedRangeIsReadAsLimited) {
+    RgbImage const picture = OnePixelPicture(200, 30, 90);
+    EXPECT_EQ(PixelFormat::ToYuv(picture).bytes,
+              PixelFormat::ToYuv(picture, ColourRange::UNSPECIFIED).bytes);
+    EXPECT_NE(PixelFormat::ToYuv(picture).bytes,
+              PixelFormat::ToYuv(picture, ColourRange::FULL).bytes);
+}
+
+TEST(PixelFormat, RgbFormatConvertsAFullRangeFrameInItsOwnRange) {
+    YuvImage grey;
+    grey.width = 2;
+    grey.height = 2;
+    grey.bytes = {128, 128, 128, 128, 128, 128};
+    std::vector<unsigned char> buffer(12);
+    PixelFormat(PixelFormat::RGB24, ColourRange::FULL).Encode(grey, buffer.data(), buffer.size());
+    EXPECT_EQ(std::vector<unsigned char>(12, 128), buffer);
+    YuvImage const back = PixelFormat(PixelFormat::RGB24, ColourRange::FULL)
+                              .DecodeYuv(2, 2, buffer.data(), buffer.size());
+    EXPECT_EQ(grey.bytes, back.bytes);
+}
+
 }  // namespace
 }  // namespace vexmap_host

@@ -241,5 +241,110 @@ TEST(Y4mReader, ReadsAFrameLargerThanOneReadStep) {
     EXPECT_EQ(AsBytes(FrameBytes(bytes, 3)), frame.bytes);
 }
 
+// One frame of a stream whose header ends in `tags`, its planes given byte by byte.
+YuvImage ReadOne(std::string const& tags, std::vector<uint8_t> const& planes) {
+    std::istringstream input("YUV4MPEG2 " + tags + "\nFRAME\n" +
+                             std::string(planes.begin(), planes.end()));
+    Y4mReader reader(input, "in.y4m");
+    YuvImage frame;
+    EXPECT_TRUE(reader.ReadFrame(frame));
+    return frame;
+}
+
+// A 4 x 2 frame's luma 0 to 7, then its planes as the layout has them.
+std::vector<uint8_t> Planes(std::vector<uint8_t> const& chroma) {
+    std::vector<uint8_t> planes(8 + chroma.size());
+    for (std::size_t index = 0; index < planes.size(); ++index) {
+        planes[index] = index < 8 ? uint8_t(index) : chroma[index - 8];
+    }
+    return planes;
+}
+
+TEST(Y4mReader, ReadsFourTwoTwoAsFourTwoZeroWithEachPairOfChromaRowsAveraged) {
+    // U rows 10 11 / 21 30, V rows 100 102 / 200 201: the means round half up.
+    YuvImage const frame = ReadOne("W4 H2 C422", Planes({10, 11, 21, 30, 100, 102, 200, 201}));
+    EXPECT_EQ((std::vector<uint8_t>{0, 1, 2, 3, 4, 5, 6, 7, 16, 21, 150, 152}), frame.bytes);
+}
+
+TEST(Y4mReader, ReadsFourFourFourAsFourTwoZeroWithEachBlockAveraged) {
+    YuvImage const frame =
+        ReadOne("W4 H2 C444", Planes({1, 2, 3, 4, 5, 6, 7, 9, 100, 100, 0, 0, 100, 101, 0, 1}));
+    // (1 + 2 + 5 + 6 + 2) / 4 = 4, (3 + 4 + 7 + 9 + 2) / 4 = 6; (401 + 2) / 4 = 100, 3 / 4 = 0.
+    EXPECT_EQ((std::vector<uint8_t>{0, 1, 2, 3, 4, 5, 6, 7, 4, 6, 100, 0}), frame.bytes);
+}
+
+TEST(Y4mReader, DropsTheAlphaPlaneOfFourFourFourAlpha) {
+    std::vector<uint8_t> planes = Planes(std::vector<uint8_t>(16, 50));
+    planes.insert(planes.end(), 8, 255);
+    std::istringstream input("YUV4MPEG2 W4 H2 C444alpha\nFRAME\n" +
+                             std::string(planes.begin(), planes.end()) + "FRAME\n" +
+                             std::string(planes.begin(), planes.end()));
+    Y4mReader reader(input, "in.y4m");
+    EXPECT_EQ(32u, reader.FrameBytes());
+    YuvImage frame;
+    ASSERT_TRUE(reader.ReadFrame(frame));
+    EXPECT_EQ((std::vector<uint8_t>{0, 1, 2, 3, 4, 5, 6, 7, 50, 50, 50, 50}), frame.bytes);
+    EXPECT_TRUE(reader.ReadFrame(frame));  // the alpha plane was not taken for the next frame
+    EXPECT_FALSE(reader.ReadFrame(frame));
+}
+
+TEST(Y4mReader, ReadsFourOneOneWithOneSampleForEachFourColumns) {
+    // 8 x 2: one U and one V a row covers the left four columns, another the right four.
+    std::vector<uint8_t> planes(16, 9);
+    planes.insert(planes.end(), {10, 20, 30, 41, 100, 110, 120, 130});
+    YuvImage const frame = ReadOne("W8 H2 C411", planes);
+    std::vector<uint8_t> const chroma(frame.bytes.begin() + 16, frame.bytes.end());
+    EXPECT_EQ((std::vector<uint8_t>{20, 20, 31, 31, 110, 110, 120, 120}), chroma);
+}
+
+TEST(Y4mReader, ReadsMonochromeWithNeutralChroma) {
+    YuvImage const frame = ReadOne("W4 H2 Cmono", Planes({}));
+    EXPECT_EQ((std::vector<uint8_t>{0, 1, 2, 3, 4, 5, 6, 7, 128, 128, 128, 128}), frame.bytes);
+}
+
+TEST(Y4mReader, FourTwoTwoOfOddSizeKeepsTheLastRowAndColumn) {
+    // 3 x 3: chroma 2 x 3 in the stream, 2 x 2 in 4:2:0; the last row stands alone.
+    std::vector<uint8_t> planes(9, 1);
+    planes.insert(planes.end(), {10, 20, 30, 40, 50, 60, 1, 2, 3, 4, 5, 6});
+    YuvImage const frame = ReadOne("W3 H3 C422", planes);
+    std::vector<uint8_t> const chroma(frame.bytes.begin() + 9, frame.bytes.end());
+    EXPECT_EQ((std::vector<uint8_t>{20, 30, 50, 60, 2, 3, 5, 6}), chroma);
+}
+
+TEST(Y4mReader, ConvertedFramesReuseTheirStorage) {
+    std::string const frame = "FRAME\n" + FrameBytes(16, 1);
+    std::istringstream input("YUV4MPEG2 W4 H2 C422\n" + frame + frame + frame);
+    Y4mReader reader(input, "in.y4m");
+    YuvImage image;
+    ASSERT_TRUE(reader.ReadFrame(image));
+    uint8_t const* const storage = image.bytes.data();
+    std::size_t const capacity = image.bytes.capacity();
+    std::vector<uint8_t> const first = image.bytes;
+    while (reader.ReadFrame(image)) {
+        EXPECT_EQ(storage, image.bytes.data());
+        EXPECT_EQ(capacity, image.bytes.capacity());
+        EXPECT_EQ(first, image.bytes);
+    }
+    EXPECT_EQ(3u, reader.FramesRead());
+}
+
+TEST(Y4mReader, ReadsTheColourRange) {
+    auto const range_of = [](std::string const& tags) {
+        std::istringstream input("YUV4MPEG2 W4 H2" + tags + "\n");
+        return Y4mReader(input, "in.y4m").Header().range;
+    };
+    EXPECT_EQ(ColourRange::FULL, range_of(" XCOLORRANGE=FULL"));
+    EXPECT_EQ(ColourRange::LIMITED, range_of(" XCOLORRANGE=LIMITED"));
+    EXPECT_EQ(ColourRange::UNSPECIFIED, range_of(""));
+    EXPECT_EQ(ColourRange::UNSPECIFIED, range_of(" XCOLORRANGE=WIDE"));
+}
+
+TEST(Y4mReader, SizeBeyondThePixelLimitIsRefusedAtTheHeader) {
+    std::istringstream input("YUV4MPEG2 W1000 H1000\n");
+    EXPECT_THAT([&input] { Y4mReader reader(input, "in.y4m", PictureLimits(999999)); },
+                ThrowsMessage<ToolError>(HasSubstr("in.y4m is 1000x1000, 1000000 pixels, beyond "
+                                                   "the limit of 999999 pixels")));
+}
+
 }  // namespace
 }  // namespace vexmap_host

@@ -133,5 +133,23 @@ TEST(Y4mWriter, SaysWhichFrameAFailedWriteMet) {
     EXPECT_EQ(0u, writer.FramesWritten());
 }
 
+TEST(Y4mWriter, WritesTheColourRangeWhenItIsKnown) {
+    for (auto [range, tag] : {std::pair{ColourRange::FULL, " XCOLORRANGE=FULL\n"},
+                              std::pair{ColourRange::LIMITED, " XCOLORRANGE=LIMITED\n"},
+                              std::pair{ColourRange::UNSPECIFIED, " C420jpeg\n"}}) {
+        std::ostringstream stream;
+        Y4mWriter writer(stream, "out.y4m", 25, 1, range);
+        YuvImage frame;
+        frame.width = 2;
+        frame.height = 2;
+        frame.bytes.assign(6, 16);
+        writer.WriteFrame(frame);
+        std::string const header = stream.str().substr(0, stream.str().find('\n') + 1);
+        EXPECT_THAT(header, ::testing::EndsWith(tag));
+        std::istringstream back(stream.str());
+        EXPECT_EQ(range, Y4mReader(back, "out.y4m").Header().range);
+    }
+}
+
 }  // namespace
 }  // namespace vexmap_host
