@@ -67,9 +67,40 @@ uint64_t ChromaHeight(ChromaLayout layout, uint64_t height) {
     return layout == ChromaLayout::C420 ? (height + 1) / 2 : height;
 }
 
-// The rounded mean of a 4:2:0 sample's sources, half up: what a box filter gives exactly.
-uint8_t Mean(unsigned sum, unsigned count) {
-    return uint8_t((sum + count / 2) / count);
+// A 4:2:0 sample covers rows 2r and 2r + 1 and columns 2c and 2c + 1 and is the mean of the
+// stream's samples over those pixels, rounded half up: (sum + count / 2) / count, what a box filter
+// gives. On an odd edge the block has one row or column, and counting it twice gives the same
+// rounded mean as counting it once, so the edge needs no loop of its own.
+
+// 4:2:2 and 4:1:1 keep one sample across a 4:2:0 block's columns (4:1:1 across two blocks, so
+// column c takes column c >> shift), and only the block's two rows are averaged.
+void AverageRows(uint8_t const* in, std::size_t in_width, std::size_t height, unsigned shift,
+                 uint8_t* out, std::size_t out_width) {
+    for (std::size_t row = 0; 2 * row < height; ++row) {
+        uint8_t const* const top = in + 2 * row * in_width;
+        uint8_t const* const bottom = 2 * row + 1 < height ? top + in_width : top;
+        uint8_t* const destination = out + row * out_width;
+        for (std::size_t column = 0; column < out_width; ++column) {
+            std::size_t const x = column >> shift;
+            destination[column] = uint8_t((unsigned(top[x]) + bottom[x] + 1) / 2);
+        }
+    }
+}
+
+// 4:4:4 has a sample for each pixel, four to a block.
+void AverageBlocks(uint8_t const* in, std::size_t width, std::size_t height, uint8_t* out,
+                   std::size_t out_width) {
+    for (std::size_t row = 0; 2 * row < height; ++row) {
+        uint8_t const* const top = in + 2 * row * width;
+        uint8_t const* const bottom = 2 * row + 1 < height ? top + width : top;
+        uint8_t* const destination = out + row * out_width;
+        for (std::size_t column = 0; column < out_width; ++column) {
+            std::size_t const left = 2 * column;
+            std::size_t const right = left + 1 < width ? left + 1 : left;
+            destination[column] =
+                uint8_t((unsigned(top[left]) + top[right] + bottom[left] + bottom[right] + 2) / 4);
+        }
+    }
 }
 
 // Decimal digits only, at most `limit`; anything else gives nothing.
@@ -107,7 +138,7 @@ bool ParseRatio(std::string const& text, int& numerator, int& denominator) {
 
 Y4mReader::Y4mReader(std::istream& source, std::string const& source_name,
                      PictureLimits const& limits)
-    : stream(source), name(source_name), header(), frame_bytes(0), frames_read(0) {
+    : stream(source), name(source_name), header(), frame_bytes(0), frames_read(0), raw(), line() {
     std::array<char, MAGIC_LENGTH + 1> start{};
     stream.read(start.data(), std::streamsize(start.size()));
     if (std::size_t(stream.gcount()) < start.size() ||
@@ -115,14 +146,14 @@ Y4mReader::Y4mReader(std::istream& source, std::string const& source_name,
         (start.back() != ' ' && start.back() != '\n')) {
         Fail("is not a YUV4MPEG2 stream");
     }
-    std::string const line =
-        start.back() == '\n' ? std::string() : ReadLine(MAX_LINE - start.size(), "stream header");
+    std::string const tags =
+        start.back() == '\n' ? std::string() : ReadLine(MAX_LINE - start.size(), 0);
     bool has_width = false;
     bool has_height = false;
     std::size_t begin = 0;
-    while (begin <= line.size()) {
-        std::size_t const end = std::min(line.find(' ', begin), line.size());
-        std::string const tag = line.substr(begin, end - begin);
+    while (begin <= tags.size()) {
+        std::size_t const end = std::min(tags.find(' ', begin), tags.size());
+        std::string const tag = tags.substr(begin, end - begin);
         has_width = has_width || (!tag.empty() && tag[0] == 'W');
         has_height = has_height || (!tag.empty() && tag[0] == 'H');
         ParseTag(tag);
@@ -221,11 +252,10 @@ bool Y4mReader::ReadFrame(YuvImage& frame) {
         }
         return false;
     }
-    std::string const what = "FRAME line of frame " + std::to_string(frames_read + 1);
-    std::string const line = ReadLine(MAX_LINE, what);
-    if (line.compare(0, FRAME_MARK_LENGTH, FRAME_MARK) != 0 ||
-        (line.size() > FRAME_MARK_LENGTH && line[FRAME_MARK_LENGTH] != ' ')) {
-        Fail("has a bad " + what + ": it does not start with FRAME");
+    std::string const& frame_line = ReadLine(MAX_LINE, frames_read + 1);
+    if (frame_line.compare(0, FRAME_MARK_LENGTH, FRAME_MARK) != 0 ||
+        (frame_line.size() > FRAME_MARK_LENGTH && frame_line[FRAME_MARK_LENGTH] != ' ')) {
+        Fail("has a bad " + LineName(frames_read + 1) + ": it does not start with FRAME");
     }
     frame.width = header.width;
     frame.height = header.height;
@@ -256,64 +286,57 @@ void Y4mReader::ReadBytes(std::vector<uint8_t>& bytes) {
     bytes.resize(total);
 }
 
-// Each 4:2:0 sample covers the pixels of rows 2r and 2r + 1 and columns 2c and 2c + 1 (fewer on an
-// odd edge) and is the mean of the samples that cover those pixels in the stream's layout.
 void Y4mReader::ConvertRaw(YuvImage& frame) const {
     std::size_t const width = std::size_t(header.width);
     std::size_t const height = std::size_t(header.height);
     std::size_t const luma = width * height;
     std::size_t const out_width = YuvImage::ChromaWidth(width);
-    std::size_t const out_height = YuvImage::ChromaHeight(height);
-    frame.bytes.resize(YuvImage::FrameBytes(width, height));
-    std::copy_n(raw.data(), luma, frame.bytes.data());
+    std::size_t const out_plane = out_width * YuvImage::ChromaHeight(height);
     std::size_t const in_width = std::size_t(ChromaWidth(header.layout, width));
-    std::size_t const in_height = std::size_t(ChromaHeight(header.layout, height));
+    std::size_t const in_plane = in_width * std::size_t(ChromaHeight(header.layout, height));
+    frame.bytes.resize(luma + 2 * out_plane);
+    std::copy_n(raw.data(), luma, frame.bytes.data());
     for (std::size_t plane = 0; plane < 2; ++plane) {
-        uint8_t* out = frame.bytes.data() + luma + plane * out_width * out_height;
-        if (header.layout == ChromaLayout::MONO) {
-            std::fill_n(out, out_width * out_height, NEUTRAL_CHROMA);
-            continue;
-        }
-        uint8_t const* in = raw.data() + luma + plane * in_width * in_height;
-        for (std::size_t row = 0; row < out_height; ++row) {
-            std::size_t const last_row = std::min(2 * row + 1, height - 1);
-            for (std::size_t column = 0; column < out_width; ++column) {
-                std::size_t const last_column = std::min(2 * column + 1, width - 1);
-                unsigned sum = 0;
-                unsigned count = 0;
-                for (std::size_t y = 2 * row; y <= last_row; ++y) {
-                    // 4:2:2 and 4:1:1 keep one sample across the pair of columns; 4:4:4 has both.
-                    std::size_t const first = header.layout == ChromaLayout::C444   ? 2 * column
-                                              : header.layout == ChromaLayout::C422 ? column
-                                                                                    : column / 2;
-                    std::size_t const last =
-                        header.layout == ChromaLayout::C444 ? last_column : first;
-                    for (std::size_t x = first; x <= last; ++x) {
-                        sum += in[y * in_width + x];
-                        ++count;
-                    }
-                }
-                out[row * out_width + column] = Mean(sum, count);
-            }
+        uint8_t const* const in = raw.data() + luma + plane * in_plane;
+        uint8_t* const out = frame.bytes.data() + luma + plane * out_plane;
+        switch (header.layout) {
+            case ChromaLayout::C422:
+                AverageRows(in, in_width, height, 0, out, out_width);
+                break;
+            case ChromaLayout::C411:
+                AverageRows(in, in_width, height, 1, out, out_width);
+                break;
+            case ChromaLayout::C444:
+                AverageBlocks(in, width, height, out, out_width);
+                break;
+            default:  // MONO; 4:2:0 without alpha is read straight into the frame
+                std::fill_n(out, out_plane, NEUTRAL_CHROMA);
+                break;
         }
     }
 }
 
-// A line without its newline. The limit counts the newline, and a line that reaches it unended
-// is refused before more is read.
-std::string Y4mReader::ReadLine(std::size_t limit, std::string const& what) {
-    std::string line;
+// A line without its newline, in storage kept from line to line, so that a FRAME line costs no
+// allocation. The limit counts the newline, and a line that reaches it unended is refused before
+// more is read.
+std::string const& Y4mReader::ReadLine(std::size_t limit, uint64_t frame) {
+    line.clear();
     char c = 0;
     while (stream.get(c)) {
         if (c == '\n') {
             return line;
         }
         if (line.size() + 1 >= limit) {
-            Fail("has a " + what + " longer than " + std::to_string(MAX_LINE) + " bytes");
+            Fail("has a " + LineName(frame) + " longer than " + std::to_string(MAX_LINE) +
+                 " bytes");
         }
         line.push_back(c);
     }
-    Fail("ends inside its " + what);
+    Fail("ends inside its " + LineName(frame));
+}
+
+std::string Y4mReader::LineName(uint64_t frame) {
+    return frame == 0 ? "stream header" : "FRAME line of frame " + std::to_string(frame);
 }
 
 void Y4mReader::Fail(std::string const& reason) const {

@@ -38,7 +38,10 @@ public:
     bool ReadFrame(YuvImage& frame);
 
 private:
-    std::string ReadLine(std::size_t limit, std::string const& what);
+    /// The next line, valid until the next call; `frame` is the number of the frame whose FRAME
+    /// line it is, 0 for the stream header.
+    std::string const& ReadLine(std::size_t limit, uint64_t frame);
+    static std::string LineName(uint64_t frame);  // for messages
     void ParseTag(std::string const& tag);
     void ParseColourSpace(std::string const& tag);
     /// Reads the frame's bytes into `bytes`, growing it only as the bytes really come.
@@ -53,6 +56,7 @@ private:
     uint64_t frame_bytes;
     uint64_t frames_read;
     std::vector<uint8_t> raw;  // a frame in the stream's layout, when that is not 4:2:0
+    std::string line;          // the line last read
 };
 
 }  // namespace vexmap_host

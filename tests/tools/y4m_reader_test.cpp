@@ -1,6 +1,13 @@
 #include "y4m_reader.h"
 
+#include <atomic>
+#include <cmath>
 #include <cstdint>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <new>
 #include <sstream>
 #include <string>
 #include <vector>
@@ -9,6 +16,35 @@
 #include <gtest/gtest.h>
 
 #include "tool_error.h"
+
+// Counts the allocations of this test binary while asked to, so that a test can show that a frame
+// after the first costs none. The replacement pairs malloc with free, which the compiler cannot
+// see through inlining.
+#if defined(__GNUC__) && !defined(__clang__)
+#pragma GCC diagnostic ignored "-Wmismatched-new-delete"
+#endif
+namespace {
+std::atomic<bool> counting{false};
+std::atomic<int> allocations{0};
+}  // namespace
+
+void* operator new(std::size_t size) {
+    if (counting.load()) {
+        ++allocations;
+    }
+    if (void* const memory = std::malloc(size == 0 ? 1 : size)) {
+        return memory;
+    }
+    throw std::bad_alloc();
+}
+
+void operator delete(void* memory) noexcept {
+    std::free(memory);
+}
+
+void operator delete(void* memory, std::size_t) noexcept {
+    std::free(memory);
+}
 
 namespace vexmap_host {
 namespace {
@@ -190,8 +226,26 @@ INSTANTIATE_TEST_SUITE_P(
         BadStream{"EmptyColourSpace", "YUV4MPEG2 W4 H2 C\n",
                   "has the colour space C, which vexmap does not read (it reads C420jpeg, "
                   "C420mpeg2, C420paldv, C420, C422, C444, C444alpha, C411, Cmono)"},
+        BadStream{"NineBit", "YUV4MPEG2 W4 H2 C420p9\n",
+                  "has the colour space C420p9, 9 bits a sample; vexmap reads 8-bit streams: "
+                  "convert with ffmpeg's -pix_fmt yuv420p"},
+        BadStream{"TenBit422", "YUV4MPEG2 W4 H2 C422p10\n",
+                  "has the colour space C422p10, 10 bits a sample; vexmap reads 8-bit streams: "
+                  "convert with ffmpeg's -pix_fmt yuv420p"},
+        BadStream{"SixteenBit444", "YUV4MPEG2 W4 H2 C444p16\n",
+                  "has the colour space C444p16, 16 bits a sample"},
+        BadStream{"TenBitMono", "YUV4MPEG2 W4 H2 Cmono10\n",
+                  "has the colour space Cmono10, 10 bits a sample; vexmap reads 8-bit streams: "
+                  "convert with ffmpeg's -pix_fmt yuv420p"},
         BadStream{"UnknownColourSpace", "YUV4MPEG2 W4 H2 C410\n",
-                  "has the colour space C410, which"},
+                  "has the colour space C410, which vexmap does not read (it reads C420jpeg, "
+                  "C420mpeg2, C420paldv, C420, C422, C444, C444alpha, C411, Cmono)"},
+        BadStream{"UnknownWithDigits", "YUV4MPEG2 W4 H2 C420x10\n",
+                  "has the colour space C420x10, which vexmap does not read"},
+        BadStream{"TruncatedSecondFourFourFourAlpha",
+                  "YUV4MPEG2 W2 H2 C444alpha\nFRAME\n" + FrameBytes(16, 1) + "FRAME\n" +
+                      FrameBytes(15, 2),
+                  "ends inside frame 2, after 15 of its 16 bytes"},
         BadStream{"TruncatedFourTwoTwo", "YUV4MPEG2 W4 H2 C422\nFRAME\n123456789",
                   "ends inside frame 1, after 9 of its 16 bytes"},
         BadStream{"RateWithoutDenominator", "YUV4MPEG2 W4 H2 F25\n", "has a frame rate"},
@@ -344,6 +398,185 @@ TEST(Y4mReader, SizeBeyondThePixelLimitIsRefusedAtTheHeader) {
     EXPECT_THAT([&input] { Y4mReader reader(input, "in.y4m", PictureLimits(999999)); },
                 ThrowsMessage<ToolError>(HasSubstr("in.y4m is 1000x1000, 1000000 pixels, beyond "
                                                    "the limit of 999999 pixels")));
+}
+
+// A stream layout, where its chroma sample of pixel (x, y) is: column x >> shift of row y of
+// each chroma plane (row y / 2 for 4:2:0, whose frames are read as they are).
+struct Layout {
+    char const* name;
+    char const* tags;  // of the header, after the size
+    ChromaLayout layout;
+    bool alpha;
+    unsigned shift;
+};
+
+Layout const LAYOUTS[] = {{"NoColourSpace", "", ChromaLayout::C420, false, 1},
+                          {"C420jpeg", " C420jpeg", ChromaLayout::C420, false, 1},
+                          {"C420mpeg2", " C420mpeg2", ChromaLayout::C420, false, 1},
+                          {"C420paldv", " C420paldv", ChromaLayout::C420, false, 1},
+                          {"C420", " C420", ChromaLayout::C420, false, 1},
+                          {"C422", " C422", ChromaLayout::C422, false, 1},
+                          {"C444", " C444", ChromaLayout::C444, false, 0},
+                          {"C444alpha", " C444alpha", ChromaLayout::C444, true, 0},
+                          {"C411", " C411", ChromaLayout::C411, false, 2},
+                          {"Cmono", " Cmono", ChromaLayout::MONO, false, 0}};
+
+struct Size {
+    int width;
+    int height;
+};
+
+Size const SIZES[] = {{4, 2}, {1, 1}, {5, 3}, {7, 4}, {6, 5}, {9, 7}, {12, 2}};
+
+std::size_t ChromaColumns(Layout const& layout, int width) {
+    return layout.layout == ChromaLayout::MONO
+               ? 0
+               : (std::size_t(width) + (1u << layout.shift) - 1) >> layout.shift;
+}
+
+std::size_t ChromaRows(Layout const& layout, int height) {
+    return layout.layout == ChromaLayout::C420 ? (std::size_t(height) + 1) / 2
+                                               : std::size_t(height);
+}
+
+std::size_t RawBytes(Layout const& layout, Size const& size) {
+    std::size_t const luma = std::size_t(size.width) * std::size_t(size.height);
+    return luma * (layout.alpha ? 2 : 1) +
+           2 * ChromaColumns(layout, size.width) * ChromaRows(layout, size.height);
+}
+
+// Bytes that leave no pattern for a slip to hide in, odd sums among them.
+std::vector<uint8_t> Scrambled(std::size_t count, uint32_t seed) {
+    std::vector<uint8_t> bytes(count);
+    for (uint8_t& byte : bytes) {
+        seed = seed * 1664525u + 1013904223u;
+        byte = uint8_t(seed >> 24);
+    }
+    return bytes;
+}
+
+// The 4:2:0 frame of a raw one, by the definition: each chroma sample is the mean of the stream's
+// samples of the pixels its 2 x 2 block covers, those the frame has, rounded half up.
+std::vector<uint8_t> PlainFourTwoZero(Layout const& layout, Size const& size,
+                                      std::vector<uint8_t> const& raw) {
+    if (layout.layout == ChromaLayout::C420) {
+        return raw;
+    }
+    std::size_t const width = std::size_t(size.width);
+    std::size_t const height = std::size_t(size.height);
+    std::size_t const out_width = (width + 1) / 2;
+    std::size_t const out_height = (height + 1) / 2;
+    std::vector<uint8_t> frame(raw.begin(), raw.begin() + std::ptrdiff_t(width * height));
+    std::size_t const in_width = ChromaColumns(layout, size.width);
+    for (std::size_t plane = 0; plane < 2; ++plane) {
+        uint8_t const* in = raw.data() + width * height + plane * in_width * height;
+        for (std::size_t row = 0; row < out_height; ++row) {
+            for (std::size_t column = 0; column < out_width; ++column) {
+                double sum = 0.0;
+                double count = 0.0;
+                for (std::size_t y = 2 * row; y < std::min(2 * row + 2, height); ++y) {
+                    for (std::size_t x = 2 * column; x < std::min(2 * column + 2, width); ++x) {
+                        sum += in_width == 0 ? 128.0 : in[y * in_width + (x >> layout.shift)];
+                        count += 1.0;
+                    }
+                }
+                frame.push_back(uint8_t(std::floor(sum / count + 0.5)));
+            }
+        }
+    }
+    return frame;
+}
+
+std::string Stream(Layout const& layout, Size const& size, std::string const& frame_line,
+                   std::vector<std::vector<uint8_t>> const& frames) {
+    std::string stream = "YUV4MPEG2 W" + std::to_string(size.width) + " H" +
+                         std::to_string(size.height) + layout.tags + "\n";
+    for (std::vector<uint8_t> const& frame : frames) {
+        stream += frame_line + "\n" + std::string(frame.begin(), frame.end());
+    }
+    return stream;
+}
+
+class Y4mReaderLayoutTest : public ::testing::TestWithParam<std::tuple<Layout, Size>> {
+protected:
+    Layout const& layout() const { return std::get<0>(GetParam()); }
+    Size const& size() const { return std::get<1>(GetParam()); }
+};
+
+TEST_P(Y4mReaderLayoutTest, TellsTheLayoutAndTheRawFrameBytesOfTheHeader) {
+    std::istringstream input(Stream(layout(), size(), "FRAME", {}));
+    Y4mReader const reader(input, "in.y4m");
+    EXPECT_EQ(std::string(layout().tags).substr(layout().tags[0] == '\0' ? 0 : 2),
+              reader.Header().colour_space);
+    EXPECT_EQ(layout().layout, reader.Header().layout);
+    EXPECT_EQ(layout().alpha, reader.Header().alpha);
+    EXPECT_EQ(RawBytes(layout(), size()), reader.FrameBytes());
+}
+
+TEST_P(Y4mReaderLayoutTest, GivesEachFrameAsFourTwoZeroWithTheMeanOfTheChromaOverEachBlock) {
+    std::vector<std::vector<uint8_t>> const raw = {Scrambled(RawBytes(layout(), size()), 1),
+                                                   Scrambled(RawBytes(layout(), size()), 2)};
+    std::istringstream input(Stream(layout(), size(), "FRAME", raw));
+    Y4mReader reader(input, "in.y4m");
+    YuvImage frame;
+    for (std::vector<uint8_t> const& bytes : raw) {
+        ASSERT_TRUE(reader.ReadFrame(frame));
+        EXPECT_EQ(size().width, frame.width);
+        EXPECT_EQ(size().height, frame.height);
+        EXPECT_EQ(PlainFourTwoZero(layout(), size(), bytes), frame.bytes);
+    }
+    EXPECT_FALSE(reader.ReadFrame(frame));
+}
+
+// The frame's storage, the raw frame's and the FRAME line's are kept from frame to frame. A
+// pointer alone could match after a free and a new allocation, so allocations are counted.
+TEST_P(Y4mReaderLayoutTest, LaterFramesOfTheStreamAllocateNothing) {
+    std::vector<std::vector<uint8_t>> raw;
+    for (uint32_t seed = 1; seed <= 4; ++seed) {
+        raw.push_back(Scrambled(RawBytes(layout(), size()), seed));
+    }
+    std::istringstream input(
+        Stream(layout(), size(), "FRAME Ip XPARAMETER=LONGER_THAN_A_SHORT_STRING", raw));
+    Y4mReader reader(input, "in.y4m");
+    YuvImage frame;
+    allocations = 0;
+    counting = true;
+    bool const first = reader.ReadFrame(frame);
+    int const first_allocations = allocations.exchange(0);
+    uint8_t const* const storage = frame.bytes.data();
+    std::size_t const capacity = frame.bytes.capacity();
+    bool const later =
+        reader.ReadFrame(frame) && reader.ReadFrame(frame) && reader.ReadFrame(frame);
+    counting = false;
+    ASSERT_TRUE(first && later);
+    EXPECT_LT(0, first_allocations);  // shows that the counting works
+    EXPECT_EQ(0, allocations.load());
+    EXPECT_EQ(storage, frame.bytes.data());
+    EXPECT_EQ(capacity, frame.bytes.capacity());
+    EXPECT_EQ(PlainFourTwoZero(layout(), size(), raw.back()), frame.bytes);
+}
+
+std::string LayoutCaseName(::testing::TestParamInfo<std::tuple<Layout, Size>> const& info) {
+    Size const& size = std::get<1>(info.param);
+    return std::string(std::get<0>(info.param).name) + "_" + std::to_string(size.width) + "x" +
+           std::to_string(size.height);
+}
+
+INSTANTIATE_TEST_SUITE_P(Layouts, Y4mReaderLayoutTest,
+                         ::testing::Combine(::testing::ValuesIn(LAYOUTS),
+                                            ::testing::ValuesIn(SIZES)),
+                         LayoutCaseName);
+
+TEST(Y4mReader, ReadsAFourTwoZeroFrameAfterOneOfAnotherLayoutInTheSameImage) {
+    Layout const& wide = LAYOUTS[6];  // C444
+    std::istringstream first(Stream(wide, {4, 2}, "FRAME", {Scrambled(24, 7)}));
+    std::istringstream second(SMALL_HEADER + "FRAME\n" + FrameBytes(12, 3));
+    YuvImage frame;
+    Y4mReader wide_reader(first, "wide.y4m");
+    ASSERT_TRUE(wide_reader.ReadFrame(frame));
+    Y4mReader reader(second, "in.y4m");
+    ASSERT_TRUE(reader.ReadFrame(frame));
+    EXPECT_EQ(AsBytes(FrameBytes(12, 3)), frame.bytes);
 }
 
 }  // namespace
