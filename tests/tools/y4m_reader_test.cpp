@@ -1,5 +1,6 @@
 #include "y4m_reader.h"
 
+#include <algorithm>
 #include <atomic>
 #include <cmath>
 #include <cstdint>
@@ -10,6 +11,7 @@
 #include <new>
 #include <sstream>
 #include <string>
+#include <unistd.h>
 #include <vector>
 
 #include <gmock/gmock.h>
@@ -577,6 +579,164 @@ TEST(Y4mReader, ReadsAFourTwoZeroFrameAfterOneOfAnotherLayoutInTheSameImage) {
     Y4mReader reader(second, "in.y4m");
     ASSERT_TRUE(reader.ReadFrame(frame));
     EXPECT_EQ(AsBytes(FrameBytes(12, 3)), frame.bytes);
+}
+
+// ffmpeg's conversions of a 4:4:4 picture the test writes: each layout ffmpeg makes of it, read as
+// 4:2:0, against ffmpeg's own 4:2:0 of it. ffmpeg converts with its box filter ("area"), the mean
+// the reader takes, and in limited range throughout, as it would make grey full range otherwise.
+class Y4mReaderFfmpegTest : public ::testing::Test {
+protected:
+    static constexpr int WIDTH = 64;
+    static constexpr int HEIGHT = 32;
+    static constexpr int FRAMES = 2;
+
+    void SetUp() override {
+        if (std::system("command -v ffmpeg > /dev/null 2>&1") != 0) {
+            GTEST_SKIP() << "ffmpeg is not installed";
+        }
+        ::testing::TestInfo const* const test =
+            ::testing::UnitTest::GetInstance()->current_test_info();
+        // Another build's run of the same test may be at work beside this one.
+        std::string name = std::string(test->test_suite_name()) + "_" + test->name() + "_" +
+                           std::to_string(getpid());
+        std::replace(name.begin(), name.end(), '/', '_');
+        directory = std::filesystem::path(::testing::TempDir()) / name;
+        std::filesystem::remove_all(directory);
+        std::filesystem::create_directories(directory);
+        WritePicture(PathOf("picture.y4m"));
+    }
+
+    void TearDown() override {
+        std::error_code ignored;
+        std::filesystem::remove_all(directory, ignored);
+    }
+
+    std::string PathOf(std::string const& file) const { return (directory / file).string(); }
+
+    // Luma a gradient with a checker of 4-pixel squares on it. Chroma changes in straight lines
+    // across, U by one level a pixel and V by three, and down, U by four levels a row and V in a
+    // curve: a 4:2:0 block's two columns differ in V, and its two rows in U, by more than the
+    // rounding, so that a sample taken from the wrong place shows. Every frame differs.
+    static void WritePicture(std::string const& path) {
+        std::ofstream file(path, std::ios::binary);
+        file << "YUV4MPEG2 W" << WIDTH << " H" << HEIGHT << " F25:1 Ip A1:1 C444\n";
+        for (int frame = 0; frame < FRAMES; ++frame) {
+            std::string planes;
+            for (int plane = 0; plane < 3; ++plane) {
+                for (int y = 0; y < HEIGHT; ++y) {
+                    for (int x = 0; x < WIDTH; ++x) {
+                        int const checker = (x / 4 + y / 4) % 2 * 20;
+                        int const value = plane == 0
+                                              ? 16 + (3 * x + 2 * y + checker + 5 * frame) % 200
+                                          : plane == 1 ? 20 + x + 4 * y + frame
+                                                       : 240 - 3 * x - y * y / 32 - frame;
+                        planes.push_back(char(uint8_t(value)));
+                    }
+                }
+            }
+            file << "FRAME\n" << planes;
+        }
+    }
+
+    // ffmpeg's stream of `from`, converted as `options` say.
+    std::string Convert(std::string const& from, std::string const& options,
+                        std::string const& to) const {
+        std::string const path = PathOf(to);
+        std::string const command = "ffmpeg -nostdin -hide_banner -loglevel error -y -i '" + from +
+                                    "' " + options + " -f yuv4mpegpipe '" + path + "' 2> '" +
+                                    PathOf("ffmpeg.txt") + "'";
+        EXPECT_EQ(0, std::system(command.c_str())) << command << "\n" << Text(PathOf("ffmpeg.txt"));
+        return path;
+    }
+
+    static std::string Text(std::string const& path) {
+        std::ifstream file(path, std::ios::binary);
+        return std::string(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
+    }
+
+    static std::vector<YuvImage> ReadAll(std::string const& path, Y4mHeader* header = nullptr) {
+        std::ifstream file(path, std::ios::binary);
+        Y4mReader reader(file, path);
+        if (header != nullptr) {
+            *header = reader.Header();
+        }
+        std::vector<YuvImage> frames(1);
+        while (reader.ReadFrame(frames.back())) {
+            frames.emplace_back();
+        }
+        frames.pop_back();
+        return frames;
+    }
+
+    std::filesystem::path directory;
+};
+
+// ffmpeg rounds its box mean in fixed point, once a pass, where the reader rounds the exact mean
+// once: they may part by one level.
+constexpr int BOX_ROUNDING_TOLERANCE = 1;
+// A 4:1:1 sample's centre lies a pixel beside the 4:2:0 sample's, across which the picture's V
+// changes by three levels, on top of the rounding.
+constexpr int FOUR_ONE_ONE_TOLERANCE = 4;
+
+struct FfmpegLayout {
+    char const* pixel_format;
+    char const* colour_space;  // the C tag ffmpeg writes for it
+    ChromaLayout layout;
+    int chroma_tolerance;  // against ffmpeg's 4:2:0; none is compared for grey, whose chroma is 128
+};
+
+class Y4mReaderFfmpegLayoutTest : public Y4mReaderFfmpegTest,
+                                  public ::testing::WithParamInterface<FfmpegLayout> {};
+
+TEST_P(Y4mReaderFfmpegLayoutTest, ReadsFfmpegsLayoutAsFfmpegsOwnFourTwoZero) {
+    std::string const scale = "-vf scale=in_range=tv:out_range=tv:flags=area -pix_fmt ";
+    std::string const picture = PathOf("picture.y4m");
+    Y4mHeader header;
+    std::vector<YuvImage> const frames =
+        ReadAll(Convert(picture, scale + GetParam().pixel_format, "layout.y4m"), &header);
+    std::vector<YuvImage> const expected =
+        ReadAll(Convert(picture, scale + "yuv420p", "reference.y4m"));
+    EXPECT_EQ(GetParam().colour_space, header.colour_space);
+    EXPECT_EQ(GetParam().layout, header.layout);
+    ASSERT_EQ(std::size_t(FRAMES), frames.size());
+    ASSERT_EQ(std::size_t(FRAMES), expected.size());
+    std::size_t const luma = std::size_t(WIDTH) * HEIGHT;
+    for (std::size_t index = 0; index < frames.size(); ++index) {
+        std::vector<uint8_t> const& bytes = frames[index].bytes;
+        std::vector<uint8_t> const& reference = expected[index].bytes;
+        ASSERT_EQ(reference.size(), bytes.size());
+        EXPECT_TRUE(
+            std::equal(bytes.begin(), bytes.begin() + std::ptrdiff_t(luma), reference.begin()))
+            << "luma of frame " << index + 1;
+        int worst = 0;
+        for (std::size_t at = luma; at < bytes.size(); ++at) {
+            int const wanted = GetParam().layout == ChromaLayout::MONO ? 128 : reference[at];
+            worst = std::max(worst, std::abs(int(bytes[at]) - wanted));
+        }
+        EXPECT_LE(worst, GetParam().chroma_tolerance) << "chroma of frame " << index + 1;
+    }
+}
+
+std::string FfmpegLayoutName(::testing::TestParamInfo<FfmpegLayout> const& info) {
+    return info.param.pixel_format;
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Layouts, Y4mReaderFfmpegLayoutTest,
+    ::testing::Values(FfmpegLayout{"yuv422p", "422", ChromaLayout::C422, BOX_ROUNDING_TOLERANCE},
+                      FfmpegLayout{"yuv444p", "444", ChromaLayout::C444, BOX_ROUNDING_TOLERANCE},
+                      FfmpegLayout{"yuv411p", "411", ChromaLayout::C411, FOUR_ONE_ONE_TOLERANCE},
+                      FfmpegLayout{"gray", "mono", ChromaLayout::MONO, 0}),
+    FfmpegLayoutName);
+
+TEST_F(Y4mReaderFfmpegTest, ReadsTheColourRangeFfmpegMarks) {
+    std::string const picture = PathOf("picture.y4m");
+    Y4mHeader full;
+    ReadAll(Convert(picture, "-pix_fmt yuv420p -color_range pc", "full.y4m"), &full);
+    EXPECT_EQ(ColourRange::FULL, full.range);
+    Y4mHeader limited;
+    ReadAll(Convert(picture, "-pix_fmt yuv422p -color_range tv", "limited.y4m"), &limited);
+    EXPECT_EQ(ColourRange::LIMITED, limited.range);
 }
 
 }  // namespace
