@@ -225,9 +225,13 @@ TEST_F(ImageFileTest, WritesAJpegThatReadsBackCloseToThePicture) {
     RgbImage picture;
     picture.width = 64;
     picture.height = 32;
-    for (int index = 0; index < 64 * 32; ++index) {
-        picture.pixels.insert(picture.pixels.end(),
-                              {uint8_t(index % 64 * 4), uint8_t(index / 64 * 8), 100});
+    picture.pixels.resize(64 * 32 * 3);
+    for (std::size_t index = 0; index < picture.pixels.size(); ++index) {
+        std::size_t const pixel = index / 3;
+        std::size_t const channel = index % 3;
+        picture.pixels[index] = channel == 0   ? uint8_t(pixel % 64 * 4)
+                                : channel == 1 ? uint8_t(pixel / 64 * 8)
+                                               : uint8_t(100);
     }
     std::string const path = PathOf("view.JPEG");
     WritePicture(path, path, picture);

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <array>
+#include <cmath>
 #include <cstdint>
 #include <cstdlib>
 #include <string>
@@ -387,8 +388,10 @@ RgbImage OnePixelPicture(uint8_t red, uint8_t green, uint8_t blue) {
     RgbImage image;
     image.width = 2;
     image.height = 2;
-    for (int pixel = 0; pixel < 4; ++pixel) {
-        image.pixels.insert(image.pixels.end(), {red, green, blue});
+    uint8_t const channels[3] = {red, green, blue};
+    image.pixels.resize(4 * 3);
+    for (std::size_t index = 0; index < image.pixels.size(); ++index) {
+        image.pixels[index] = channels[index % 3];
     }
     return image;
 }
@@ -442,6 +445,161 @@ TEST(PixelFormat, RgbFormatConvertsAFullRangeFrameInItsOwnRange) {
     YuvImage const back = PixelFormat(PixelFormat::RGB24, ColourRange::FULL)
                               .DecodeYuv(2, 2, buffer.data(), buffer.size());
     EXPECT_EQ(grey.bytes, back.bytes);
+}
+
+// Uniform 2 x 2 blocks of colours every 15 steps of each channel, side by side, so that each
+// block's chroma belongs to its colour alone.
+std::vector<Rgb> GridColours() {
+    std::vector<Rgb> colours;
+    for (int r = 0; r <= 255; r += 15) {
+        for (int g = 0; g <= 255; g += 15) {
+            for (int b = 0; b <= 255; b += 15) {
+                colours.push_back({uint8_t(r), uint8_t(g), uint8_t(b)});
+            }
+        }
+    }
+    return colours;
+}
+
+RgbImage Blocks(std::vector<Rgb> const& colours) {
+    int const width = int(colours.size()) * 2;
+    RgbImage image = Uniform(width, 2, {0, 0, 0});
+    for (std::size_t index = 0; index < colours.size(); ++index) {
+        for (std::size_t pixel : {2 * index, 2 * index + 1, 2 * index + std::size_t(width),
+                                  2 * index + 1 + std::size_t(width)}) {
+            std::copy(colours[index].begin(), colours[index].end(), &image.pixels[pixel * 3]);
+        }
+    }
+    return image;
+}
+
+// BT.601 from RGB bytes: Y' = 0.299 R + 0.587 G + 0.114 B; luma = black + scale Y', and each colour
+// difference 128 + its scale times (B - Y') / 1.772 or (R - Y') / 1.402, rounded and clamped.
+struct RangeForm {
+    char const* name;
+    ColourRange range;
+    double black;
+    double luma_scale;
+    double chroma_scale;
+};
+
+class PixelFormatRangeTest : public ::testing::TestWithParam<RangeForm> {};
+
+// Whether `byte` is `value` rounded and clamped to a byte. A value half way between two bytes,
+// as full range's chroma often is ((R - Y') / 1.402 is (R - G) / 2 where G = B), may go either way
+// by the last bit of the arithmetic, so both neighbours are taken there.
+bool IsRounded(uint8_t byte, double value) {
+    double const clamped = std::clamp(value, 0.0, 255.0);
+    double const below = std::floor(clamped);
+    if (std::abs(clamped - below - 0.5) < 1e-9) {
+        return byte == below || byte == below + 1.0;
+    }
+    return byte == std::lround(clamped);
+}
+
+TEST_P(PixelFormatRangeTest, ToYuvOfEachColourIsTheClosedFormOfItsRange) {
+    RangeForm const& form = GetParam();
+    std::vector<Rgb> const colours = GridColours();
+    YuvImage const yuv = PixelFormat::ToYuv(Blocks(colours), form.range);
+    int mismatches = 0;
+    for (std::size_t index = 0; index < colours.size(); ++index) {
+        double const r = colours[index][0];
+        double const g = colours[index][1];
+        double const b = colours[index][2];
+        double const y = 0.299 * r + 0.587 * g + 0.114 * b;
+        Yuv const actual = YuvAt(yuv, int(2 * index), 1);
+        if ((!IsRounded(actual[0], form.black + form.luma_scale * y) ||
+             !IsRounded(actual[1], 128.0 + form.chroma_scale * (b - y) / 1.772) ||
+             !IsRounded(actual[2], 128.0 + form.chroma_scale * (r - y) / 1.402)) &&
+            ++mismatches <= 5) {
+            ADD_FAILURE() << "RGB " << r << " " << g << " " << b << " gives Y " << int(actual[0])
+                          << " U " << int(actual[1]) << " V " << int(actual[2]);
+        }
+    }
+    EXPECT_EQ(0, mismatches);
+}
+
+std::string RangeName(::testing::TestParamInfo<RangeForm> const& info) {
+    return info.param.name;
+}
+
+INSTANTIATE_TEST_SUITE_P(Ranges, PixelFormatRangeTest,
+                         ::testing::Values(RangeForm{"Limited", ColourRange::LIMITED, 16.0,
+                                                     219.0 / 255.0, 224.0 / 255.0},
+                                           RangeForm{"Unspecified", ColourRange::UNSPECIFIED, 16.0,
+                                                     219.0 / 255.0, 224.0 / 255.0},
+                                           RangeForm{"Full", ColourRange::FULL, 0.0, 1.0, 1.0}),
+                         RangeName);
+
+TEST(PixelFormat, FullRangeGivesTheGreenAndYellowOfTheWholeByte) {
+    EXPECT_EQ((Yuv{150, 44, 21}),
+              YuvAt(PixelFormat::ToYuv(Uniform(2, 2, {0, 255, 0}), ColourRange::FULL), 0, 0));
+    EXPECT_EQ((Yuv{226, 0, 149}),
+              YuvAt(PixelFormat::ToYuv(Uniform(2, 2, {255, 255, 0}), ColourRange::FULL), 0, 0));
+}
+
+// Full range spends the whole byte on luma and finer steps than limited on chroma, so a colour
+// comes back within one level where limited range needs two.
+TEST(PixelFormat, FullRangeRgbThroughYuvAndBackStaysWithinOneOverTheGrid) {
+    RgbImage const image = Blocks(GridColours());
+    RgbImage const back =
+        PixelFormat::ToRgb(PixelFormat::ToYuv(image, ColourRange::FULL), ColourRange::FULL);
+    ASSERT_EQ(image.pixels.size(), back.pixels.size());
+    int worst = 0;
+    for (std::size_t index = 0; index < image.pixels.size(); ++index) {
+        worst = std::max(worst, std::abs(int(image.pixels[index]) - int(back.pixels[index])));
+    }
+    EXPECT_LE(worst, 1);
+}
+
+TEST(PixelFormat, FullRangeToRgbTakesTheEndsOfTheByteToBlackWhiteAndRed) {
+    YuvImage yuv;
+    yuv.width = 6;
+    yuv.height = 1;
+    // Blocks: luma 0, 255 and 76 with chroma neutral, neutral and red's 85, 255.
+    yuv.bytes = {0, 0, 255, 255, 76, 76, 128, 128, 85, 128, 128, 255};
+    RgbImage const rgb = PixelFormat::ToRgb(yuv, ColourRange::FULL);
+    EXPECT_EQ((Rgb{0, 0, 0}), RgbAt(rgb, 0, 0));
+    EXPECT_EQ((Rgb{255, 255, 255}), RgbAt(rgb, 2, 0));
+    Rgb const red = RgbAt(rgb, 4, 0);
+    EXPECT_NEAR(255, red[0], 1);
+    EXPECT_NEAR(0, red[1], 1);
+    EXPECT_NEAR(0, red[2], 1);
+}
+
+TEST(PixelFormat, ToRgbOfLimitedRangeIsTheDefaultAndDiffersFromFull) {
+    YuvImage const yuv = NumberedYuv(6, 4);
+    EXPECT_EQ(PixelFormat::ToRgb(yuv).pixels, PixelFormat::ToRgb(yuv, ColourRange::LIMITED).pixels);
+    EXPECT_EQ(PixelFormat::ToRgb(yuv).pixels,
+              PixelFormat::ToRgb(yuv, ColourRange::UNSPECIFIED).pixels);
+    EXPECT_NE(PixelFormat::ToRgb(yuv).pixels, PixelFormat::ToRgb(yuv, ColourRange::FULL).pixels);
+}
+
+TEST(PixelFormat, FourTwoZeroFormatOfFullRangeConvertsRgbInFullRange) {
+    RgbImage const image = NumberedPixels(4, 2);
+    PixelFormat const full(PixelFormat::I420, ColourRange::FULL);
+    std::vector<unsigned char> buffer(12, 0xEE);
+    full.Encode(image, buffer.data(), buffer.size());
+    EXPECT_EQ(PixelFormat::ToYuv(image, ColourRange::FULL).bytes, buffer);
+    EXPECT_NE(PixelFormat::ToYuv(image).bytes, buffer);
+    EXPECT_EQ(
+        PixelFormat::ToRgb(PixelFormat::ToYuv(image, ColourRange::FULL), ColourRange::FULL).pixels,
+        full.Decode(4, 2, buffer.data(), buffer.size()).pixels);
+}
+
+TEST(PixelFormat, RgbFormatOfLimitedRangeConvertsAsTheDefaultDoes) {
+    YuvImage const yuv = NumberedYuv(4, 2);
+    std::vector<unsigned char> by_default(24);
+    std::vector<unsigned char> limited(24);
+    PixelFormat(PixelFormat::RGB24).Encode(yuv, by_default.data(), by_default.size());
+    PixelFormat(PixelFormat::RGB24, ColourRange::LIMITED)
+        .Encode(yuv, limited.data(), limited.size());
+    EXPECT_EQ(PixelFormat::ToRgb(yuv).pixels, by_default);
+    EXPECT_EQ(by_default, limited);
+    EXPECT_EQ(PixelFormat::ToYuv(PixelFormat::ToRgb(yuv)).bytes,
+              PixelFormat(PixelFormat::RGB24, ColourRange::LIMITED)
+                  .DecodeYuv(4, 2, limited.data(), limited.size())
+                  .bytes);
 }
 
 }  // namespace
