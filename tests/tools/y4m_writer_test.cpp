@@ -151,5 +151,16 @@ TEST(Y4mWriter, WritesTheColourRangeWhenItIsKnown) {
     }
 }
 
+TEST(Y4mWriter, StillSaysFourTwoZeroBesideTheColourRange) {
+    std::ostringstream output;
+    Y4mWriter writer(output, "out.y4m", 25, 1, ColourRange::FULL);
+    YuvImage const frame = Numbered(4, 2, 0);
+    writer.WriteFrame(frame);
+    writer.WriteFrame(frame);
+    EXPECT_EQ("YUV4MPEG2 W4 H2 F25:1 Ip A1:1 C420jpeg XCOLORRANGE=FULL\nFRAME\n" + Text(frame) +
+                  "FRAME\n" + Text(frame),
+              output.str());
+}
+
 }  // namespace
 }  // namespace vexmap_host
