@@ -389,7 +389,7 @@ RgbImage OnePixelPicture(uint8_t red, uint8_t green, uint8_t blue) {
     image.width = 2;
     image.height = 2;
     uint8_t const channels[3] = {red, green, blue};
-    image.pixels.resize(4 * 3);
+    image.pixels.resize(std::size_t(4) * 3);
     for (std::size_t index = 0; index < image.pixels.size(); ++index) {
         image.pixels[index] = channels[index % 3];
     }

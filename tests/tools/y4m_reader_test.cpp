@@ -682,7 +682,7 @@ protected:
     // ffmpeg's stream of `from`, converted as `options` say.
     std::string Convert(std::string const& from, std::string const& options,
                         std::string const& to) const {
-        std::string const path = PathOf(to);
+        std::string path = PathOf(to);
         std::string const command = "ffmpeg -nostdin -hide_banner -loglevel error -y -i '" + from +
                                     "' " + options + " -f yuv4mpegpipe '" + path + "' 2> '" +
                                     PathOf("ffmpeg.txt") + "'";
