@@ -43,8 +43,25 @@ bool IsJpegName(std::string const& path) {
     return extension == "jpg" || extension == "jpeg";
 }
 
+bool StartsWith(std::vector<unsigned char> const& bytes,
+                std::initializer_list<unsigned char> magic) {
+    return bytes.size() >= magic.size() && std::equal(magic.begin(), magic.end(), bytes.begin());
+}
+
+bool IsPng(std::vector<unsigned char> const& bytes) {
+    return StartsWith(bytes, {0x89, 'P', 'N', 'G', '\r', '\n', 0x1A, '\n'});
+}
+
+bool IsJpeg(std::vector<unsigned char> const& bytes) {
+    return StartsWith(bytes, {0xFF, 0xD8, 0xFF});
+}
+
+// Enough bytes to tell a PNG (8) or a JPEG (3) by their start.
+constexpr std::size_t SIGNATURE_BYTES = 8;
+
 // The whole file, read with the system's calls so that a folder or a device gives its own error
-// text rather than a stream library's.
+// text rather than a stream library's. A file that does not start as a picture is refused after
+// its first bytes, so that a film or a device that never ends is not read into memory.
 std::vector<unsigned char> ReadBytes(std::string const& path) {
     int const file = open(path.c_str(), O_RDONLY | O_CLOEXEC);
     if (file < 0) {
@@ -63,6 +80,7 @@ std::vector<unsigned char> ReadBytes(std::string const& path) {
                         " bytes, more than any picture vexmap takes");
     }
     std::vector<unsigned char> bytes;
+    bool told = false;
     unsigned char chunk[65536];
     for (;;) {
         ssize_t const got = read(file, chunk, sizeof chunk);
@@ -76,6 +94,15 @@ std::vector<unsigned char> ReadBytes(std::string const& path) {
             break;
         }
         bytes.insert(bytes.end(), chunk, chunk + got);
+        if (!told && bytes.size() >= SIGNATURE_BYTES) {
+            told = true;
+            if (!IsPng(bytes) && !IsJpeg(bytes)) {
+                throw ToolError(path + " is neither a PNG nor a JPEG file");
+            }
+            if (S_ISREG(status.st_mode)) {
+                bytes.reserve(std::size_t(status.st_size));
+            }
+        }
         if (bytes.size() > std::size_t(MAX_PICTURE_FILE_BYTES)) {
             throw ToolError(path + " holds more bytes than any picture vexmap takes");
         }
@@ -84,11 +111,6 @@ std::vector<unsigned char> ReadBytes(std::string const& path) {
         throw ToolError(path + " is empty");
     }
     return bytes;
-}
-
-bool StartsWith(std::vector<unsigned char> const& bytes,
-                std::initializer_list<unsigned char> magic) {
-    return bytes.size() >= magic.size() && std::equal(magic.begin(), magic.end(), bytes.begin());
 }
 
 RgbImage DecodePng(std::string const& path, std::vector<unsigned char> const& bytes,
@@ -106,7 +128,9 @@ RgbImage DecodePng(std::string const& path, std::vector<unsigned char> const& by
     image.width = int(png.width);
     image.height = int(png.height);
     image.pixels.resize(PNG_IMAGE_SIZE(png));
-    if (png_image_finish_read(&png, nullptr, image.pixels.data(), 0, nullptr) == 0) {
+    // A camera's picture has no alpha worth keeping; transparent parts are chosen to show black.
+    png_color const black = {0, 0, 0};
+    if (png_image_finish_read(&png, &black, image.pixels.data(), 0, nullptr) == 0) {
         throw ToolError(path + " is not a readable PNG file: " + OneLine(png.message));
     }
     return image;
@@ -131,16 +155,53 @@ RgbImage DecodeJpeg(std::string const& path, std::vector<unsigned char> const& b
         throw ToolError(path + " is not a readable JPEG file: its header gives no size");
     }
     limits.Check(path, uint64_t(width), uint64_t(height));
+    std::size_t const pixels = std::size_t(width) * std::size_t(height);
     RgbImage image;
     image.width = width;
     image.height = height;
-    image.pixels.resize(std::size_t(width) * std::size_t(height) * 3);
+    // The decoder turns CMYK and YCCK files into CMYK only: they are converted to RGB here.
+    bool const ink = colorspace == TJCS_CMYK || colorspace == TJCS_YCCK;
+    std::vector<unsigned char> decoded(pixels * (ink ? 4 : 3));
     if (tjDecompress2(decoder.get(), bytes.data(), static_cast<unsigned long>(bytes.size()),
-                      image.pixels.data(), width, 0, height, TJPF_RGB, 0) != 0) {
+                      decoded.data(), width, 0, height, ink ? TJPF_CMYK : TJPF_RGB, 0) != 0) {
         throw ToolError(path +
                         " is not a readable JPEG file: " + OneLine(tjGetErrorStr2(decoder.get())));
     }
+    if (!ink) {
+        image.pixels = std::move(decoded);
+        return image;
+    }
+    // CMYK JPEGs hold their samples inverted (255 is no ink), as the programs that write them do;
+    // without a colour profile each colour is what its ink and the black ink leave of white.
+    image.pixels.resize(pixels * 3);
+    for (std::size_t index = 0; index < pixels; ++index) {
+        unsigned char const* sample = &decoded[index * 4];
+        unsigned char* pixel = &image.pixels[index * 3];
+        for (std::size_t channel = 0; channel < 3; ++channel) {
+            pixel[channel] = uint8_t((unsigned(sample[channel]) * sample[3] + 127) / 255);
+        }
+    }
     return image;
+}
+
+using OutputStream = std::unique_ptr<FILE, int (*)(FILE*)>;
+
+OutputStream OpenToWrite(std::string const& path) {
+    OutputStream file(fopen(path.c_str(), "wb"), fclose);
+    if (file == nullptr) {
+        throw ToolError("cannot write " + path + ": " + strerror(errno));
+    }
+    return file;
+}
+
+// The buffered end of the file reaches the disc here, so a full disc shows here too.
+void CloseWritten(std::string const& path, OutputStream file) {
+    if (fflush(file.get()) != 0) {
+        throw ToolError("cannot write " + path + ": " + strerror(errno));
+    }
+    if (fclose(file.release()) != 0) {
+        throw ToolError("cannot write " + path + ": " + strerror(errno));
+    }
 }
 
 void RequireWhole(RgbImage const& image) {
@@ -156,10 +217,10 @@ void RequireWhole(RgbImage const& image) {
 
 RgbImage ReadImage(std::string const& path, PictureLimits const& limits) {
     std::vector<unsigned char> const bytes = ReadBytes(path);
-    if (StartsWith(bytes, {0x89, 'P', 'N', 'G', '\r', '\n', 0x1A, '\n'})) {
+    if (IsPng(bytes)) {
         return DecodePng(path, bytes, limits);
     }
-    if (StartsWith(bytes, {0xFF, 0xD8, 0xFF})) {
+    if (IsJpeg(bytes)) {
         return DecodeJpeg(path, bytes, limits);
     }
     throw ToolError(path + " is neither a PNG nor a JPEG file");
@@ -167,15 +228,20 @@ RgbImage ReadImage(std::string const& path, PictureLimits const& limits) {
 
 void WritePng(std::string const& path, RgbImage const& image) {
     RequireWhole(image);
+    OutputStream file = OpenToWrite(path);
     png_image png;
     memset(&png, 0, sizeof png);
     png.version = PNG_IMAGE_VERSION;
     png.width = png_uint_32(image.width);
     png.height = png_uint_32(image.height);
     png.format = PNG_FORMAT_RGB;
-    if (png_image_write_to_file(&png, path.c_str(), 0, image.pixels.data(), 0, nullptr) == 0) {
-        throw ToolError("cannot write " + path + ": " + OneLine(png.message));
+    if (png_image_write_to_stdio(&png, file.get(), 0, image.pixels.data(), 0, nullptr) == 0) {
+        // A failed write leaves libpng's own words ("Write Error"); the system's say why.
+        int const reason = errno;
+        std::string const why = ferror(file.get()) != 0 ? strerror(reason) : OneLine(png.message);
+        throw ToolError("cannot write " + path + ": " + why);
     }
+    CloseWritten(path, std::move(file));
 }
 
 void WriteJpeg(std::string const& path, RgbImage const& image, int quality) {
@@ -192,16 +258,11 @@ void WriteJpeg(std::string const& path, RgbImage const& image, int quality) {
         throw ToolError("cannot encode " + path + ": " + OneLine(tjGetErrorStr2(encoder.get())));
     }
     std::unique_ptr<unsigned char, void (*)(unsigned char*)> owned(encoded, tjFree);
-    std::unique_ptr<FILE, int (*)(FILE*)> file(fopen(path.c_str(), "wb"), fclose);
-    if (file == nullptr) {
+    OutputStream file = OpenToWrite(path);
+    if (fwrite(encoded, 1, size, file.get()) != size) {
         throw ToolError("cannot write " + path + ": " + strerror(errno));
     }
-    if (fwrite(encoded, 1, size, file.get()) != size || fflush(file.get()) != 0) {
-        throw ToolError("cannot write " + path + ": " + strerror(errno));
-    }
-    if (fclose(file.release()) != 0) {
-        throw ToolError("cannot write " + path + ": " + strerror(errno));
-    }
+    CloseWritten(path, std::move(file));
 }
 
 void WritePicture(std::string const& path, std::string const& name, RgbImage const& image) {
@@ -212,6 +273,10 @@ void WritePicture(std::string const& path, std::string const& name, RgbImage con
     } else {
         throw ToolError("cannot write " + name + ": vexmap writes .png, .jpg and .jpeg pictures");
     }
+}
+
+void WritePicture(std::string const& path, RgbImage const& image) {
+    WritePicture(path, path, image);
 }
 
 bool IsPictureExtension(std::string const& path) {
