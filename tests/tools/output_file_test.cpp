@@ -44,6 +44,11 @@ protected:
         return names;
     }
 
+    static mode_t ModeOf(std::string const& path) {
+        struct stat status = {};
+        return stat(path.c_str(), &status) == 0 ? status.st_mode & 07777 : mode_t(-1);
+    }
+
     static std::string Text(std::string const& path) {
         std::ifstream file(path, std::ios::binary);
         return std::string((std::istreambuf_iterator<char>(file)),
@@ -57,6 +62,9 @@ TEST_F(OutputFileTest, AppearsAtItsPathOnlyOnCommit) {
     std::string const path = PathOf("view.png");
     OutputFile file(path);
     EXPECT_NE(path, file.Path());
+    // Hidden beside the path, so that the rename stays within one filesystem.
+    EXPECT_EQ(directory, std::filesystem::path(file.Path()).parent_path());
+    EXPECT_THAT(std::filesystem::path(file.Path()).filename().string(), StartsWith(".view.png."));
     std::ofstream(file.Path()) << "picture";
     EXPECT_FALSE(std::filesystem::exists(path));
     file.Commit();
@@ -94,8 +102,10 @@ TEST_F(OutputFileTest, UnwritablePlaceFailsAtOnceNamingThePath) {
     EXPECT_THAT([&] { OutputFile file(below_a_file); },
                 ThrowsMessage<ToolError>("cannot write " + below_a_file + ": Not a directory"));
     std::string const in_missing = PathOf("missing/view.png");
-    EXPECT_THAT([&] { OutputFile file(in_missing); },
-                ThrowsMessage<ToolError>(HasSubstr(in_missing + ": No such file or directory")));
+    EXPECT_THAT(
+        [&] { OutputFile file(in_missing); },
+        ThrowsMessage<ToolError>("cannot write " + in_missing + ": No such file or directory"));
+    EXPECT_EQ(std::vector<std::string>{"plain.txt"}, Names());
 }
 
 TEST_F(OutputFileTest, ExistingFolderAtThePathIsRefused) {
@@ -105,13 +115,73 @@ TEST_F(OutputFileTest, ExistingFolderAtThePathIsRefused) {
 }
 
 TEST_F(OutputFileTest, NewFileGetsThePermissionsOfAnyNewFile) {
+    for (mode_t const mask : {mode_t(022), mode_t(027), mode_t(0)}) {
+        std::string const path = PathOf("view-" + std::to_string(mask) + ".png");
+        mode_t const previous = umask(mask);
+        OutputFile file(path);
+        file.Commit();
+        umask(previous);
+        EXPECT_EQ(mode_t(0666) & ~mask, ModeOf(path)) << "umask " << mask;
+    }
+}
+
+TEST_F(OutputFileTest, ReplacedFileKeepsItsPermissions) {
+    std::string const path = PathOf("private.png");
+    std::ofstream(path) << "old";
+    ASSERT_EQ(0, chmod(path.c_str(), 0600));
     mode_t const previous = umask(022);
-    OutputFile file(PathOf("view.png"));
+    OutputFile file(path);
+    std::ofstream(file.Path()) << "new";
     file.Commit();
     umask(previous);
-    struct stat status = {};
-    ASSERT_EQ(0, stat(PathOf("view.png").c_str(), &status));
-    EXPECT_EQ(mode_t(0644), status.st_mode & 0777);
+    EXPECT_EQ("new", Text(path));
+    EXPECT_EQ(mode_t(0600), ModeOf(path));
+}
+
+TEST_F(OutputFileTest, LinkToAFileReplacesThatFileAndStaysALink) {
+    std::filesystem::create_directories(directory / "kept");
+    std::string const real = PathOf("kept/view.png");
+    std::ofstream(real) << "old";
+    std::string const link = PathOf("view.png");
+    std::filesystem::create_symlink(real, link);
+    OutputFile file(link);
+    std::ofstream(file.Path()) << "new";
+    file.Commit();
+    EXPECT_TRUE(std::filesystem::is_symlink(link));
+    EXPECT_EQ("new", Text(real));
+    EXPECT_EQ((std::vector<std::string>{"kept", "view.png"}), Names());
+}
+
+TEST_F(OutputFileTest, FailedCommitNamesThePathAndLeavesNoTemporaryFile) {
+    std::string const path = PathOf("view.png");
+    {
+        OutputFile file(path);
+        std::ofstream(file.Path()) << "new";
+        // A folder with something in it appears at the path while the file is written.
+        std::filesystem::create_directories(directory / "view.png" / "inside");
+        EXPECT_THAT([&] { file.Commit(); },
+                    ThrowsMessage<ToolError>(StartsWith("cannot write " + path + ": ")));
+    }
+    EXPECT_EQ(std::vector<std::string>{"view.png"}, Names());
+    EXPECT_TRUE(std::filesystem::is_directory(path));
+}
+
+TEST_F(OutputFileTest, MovedFileIsCommittedOnceAndNotRemovedByItsOldSelf) {
+    std::vector<OutputFile> files;
+    for (int index = 0; index < 5; ++index) {
+        files.emplace_back(PathOf("view-" + std::to_string(index) + ".png"));  // moves as it grows
+    }
+    for (OutputFile& file : files) {
+        EXPECT_TRUE(std::filesystem::exists(file.Path())) << file.FinalPath();
+        std::ofstream(file.Path()) << file.FinalPath();
+        file.Commit();
+    }
+    files.clear();
+    for (int index = 0; index < 5; ++index) {
+        std::string const path = PathOf("view-" + std::to_string(index) + ".png");
+        EXPECT_EQ(path, Text(path));
+    }
+    EXPECT_EQ(5u, Names().size());
 }
 
 TEST_F(OutputFileTest, DeviceIsWrittenInPlace) {
@@ -119,7 +189,23 @@ TEST_F(OutputFileTest, DeviceIsWrittenInPlace) {
     EXPECT_EQ("/dev/null", file.Path());
     file.Commit();
     EXPECT_TRUE(OutputFile::IsDevice("/dev/null"));
+    EXPECT_TRUE(std::filesystem::is_character_file("/dev/null"));
     EXPECT_FALSE(OutputFile::IsDevice(PathOf("absent")));
+}
+
+TEST_F(OutputFileTest, FifoIsWrittenInPlace) {
+    std::string const path = PathOf("pipe");
+    ASSERT_EQ(0, mkfifo(path.c_str(), 0600));
+    EXPECT_TRUE(OutputFile::IsDevice(path));
+    {
+        OutputFile file(path);
+        EXPECT_EQ(path, file.Path());
+        EXPECT_EQ(std::vector<std::string>{"pipe"}, Names());
+        file.Commit();
+    }
+    EXPECT_TRUE(std::filesystem::is_fifo(path));
+    std::ofstream(PathOf("plain")) << "x";
+    EXPECT_FALSE(OutputFile::IsDevice(PathOf("plain")));
 }
 
 TEST_F(OutputFileTest, SameFileSeesThroughLinksAndDots) {
