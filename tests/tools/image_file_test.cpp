@@ -475,7 +475,7 @@ TEST_F(ImageFileTest, JpegKeepsTheColourOfOnePixelLines) {
     RgbImage const back = ReadImage(path);
     ASSERT_EQ(picture.pixels.size(), back.pixels.size());
     for (int column = 8; column < 10; ++column) {
-        uint8_t const* pixel = &back.pixels[(8 * 32 + column) * 3];
+        uint8_t const* pixel = &back.pixels[std::size_t(8 * 32 + column) * 3];
         bool const red = column % 2 == 0;
         EXPECT_GT(int(pixel[red ? 0 : 2]), int(pixel[red ? 2 : 0]) + 100) << column;
     }
