@@ -17,6 +17,7 @@
 #include <gtest/gtest.h>
 
 #include "crafted_pictures.h"
+#include "scratch_folder.h"
 #include "tool_error.h"
 
 namespace vexmap_host {
@@ -117,18 +118,10 @@ std::string RefusalOf(std::string const& path) {
 
 class ImageFileTest : public ::testing::Test {
 protected:
-    void SetUp() override {
-        directory = std::filesystem::path(::testing::TempDir()) /
-                    ("vexmap-image-file-" +
-                     std::string(::testing::UnitTest::GetInstance()->current_test_info()->name()) +
-                     "-" + std::to_string(getpid()));
-        std::filesystem::create_directories(directory);
-    }
-    void TearDown() override { std::filesystem::remove_all(directory); }
+    std::string PathOf(std::string const& name) const { return scratch.PathOf(name); }
 
-    std::string PathOf(std::string const& name) const { return (directory / name).string(); }
-
-    std::filesystem::path directory;
+    ScratchFolder const scratch{"vexmap-image-file-"};
+    std::filesystem::path const directory = scratch.Path();
 };
 
 TEST_F(ImageFileTest, PngRoundTripKeepsEveryPixel) {

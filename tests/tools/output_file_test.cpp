@@ -12,6 +12,7 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
+#include "scratch_folder.h"
 #include "tool_error.h"
 
 namespace vexmap_host {
@@ -23,17 +24,7 @@ using ::testing::ThrowsMessage;
 
 class OutputFileTest : public ::testing::Test {
 protected:
-    void SetUp() override {
-        directory = std::filesystem::path(::testing::TempDir()) /
-                    ("vexmap-output-file-" +
-                     std::string(::testing::UnitTest::GetInstance()->current_test_info()->name()) +
-                     "-" + std::to_string(getpid()));
-        std::filesystem::remove_all(directory);
-        std::filesystem::create_directories(directory);
-    }
-    void TearDown() override { std::filesystem::remove_all(directory); }
-
-    std::string PathOf(std::string const& name) const { return (directory / name).string(); }
+    std::string PathOf(std::string const& name) const { return scratch.PathOf(name); }
 
     std::vector<std::string> Names() const {
         std::vector<std::string> names;
@@ -55,7 +46,8 @@ protected:
                            std::istreambuf_iterator<char>());
     }
 
-    std::filesystem::path directory;
+    ScratchFolder const scratch{"vexmap-output-file-"};
+    std::filesystem::path const directory = scratch.Path();
 };
 
 TEST_F(OutputFileTest, AppearsAtItsPathOnlyOnCommit) {

@@ -218,9 +218,9 @@ TEST(PixelFormat, ToYuvGivesAnOddEdgeItsOwnChroma) {
     EXPECT_EQ((Yuv{41, 240, 110}), YuvAt(yuv, 2, 2));
 }
 
-// Colours every 15 steps of each channel, each filling its own 2 x 2 block so that the chroma
-// belongs to it alone.
-TEST(PixelFormat, RgbThroughYuvAndBackStaysWithinTolerance) {
+// Uniform 2 x 2 blocks of colours every 15 steps of each channel, side by side, so that each
+// block's chroma belongs to its colour alone.
+std::vector<Rgb> GridColours() {
     std::vector<Rgb> colours;
     for (int r = 0; r <= 255; r += 15) {
         for (int g = 0; g <= 255; g += 15) {
@@ -229,6 +229,10 @@ TEST(PixelFormat, RgbThroughYuvAndBackStaysWithinTolerance) {
             }
         }
     }
+    return colours;
+}
+
+RgbImage Blocks(std::vector<Rgb> const& colours) {
     int const width = int(colours.size()) * 2;
     RgbImage image = Uniform(width, 2, {0, 0, 0});
     for (std::size_t index = 0; index < colours.size(); ++index) {
@@ -237,6 +241,11 @@ TEST(PixelFormat, RgbThroughYuvAndBackStaysWithinTolerance) {
             std::copy(colours[index].begin(), colours[index].end(), &image.pixels[pixel * 3]);
         }
     }
+    return image;
+}
+
+TEST(PixelFormat, RgbThroughYuvAndBackStaysWithinTolerance) {
+    RgbImage const image = Blocks(GridColours());
     RgbImage const back = PixelFormat::ToRgb(PixelFormat::ToYuv(image));
     ASSERT_EQ(image.pixels.size(), back.pixels.size());
     int worst = 0;
@@ -445,32 +454,6 @@ TEST(PixelFormat, RgbFormatConvertsAFullRangeFrameInItsOwnRange) {
     YuvImage const back = PixelFormat(PixelFormat::RGB24, ColourRange::FULL)
                               .DecodeYuv(2, 2, buffer.data(), buffer.size());
     EXPECT_EQ(grey.bytes, back.bytes);
-}
-
-// Uniform 2 x 2 blocks of colours every 15 steps of each channel, side by side, so that each
-// block's chroma belongs to its colour alone.
-std::vector<Rgb> GridColours() {
-    std::vector<Rgb> colours;
-    for (int r = 0; r <= 255; r += 15) {
-        for (int g = 0; g <= 255; g += 15) {
-            for (int b = 0; b <= 255; b += 15) {
-                colours.push_back({uint8_t(r), uint8_t(g), uint8_t(b)});
-            }
-        }
-    }
-    return colours;
-}
-
-RgbImage Blocks(std::vector<Rgb> const& colours) {
-    int const width = int(colours.size()) * 2;
-    RgbImage image = Uniform(width, 2, {0, 0, 0});
-    for (std::size_t index = 0; index < colours.size(); ++index) {
-        for (std::size_t pixel : {2 * index, 2 * index + 1, 2 * index + std::size_t(width),
-                                  2 * index + 1 + std::size_t(width)}) {
-            std::copy(colours[index].begin(), colours[index].end(), &image.pixels[pixel * 3]);
-        }
-    }
-    return image;
 }
 
 // BT.601 from RGB bytes: Y' = 0.299 R + 0.587 G + 0.114 B; luma = black + scale Y', and each colour

@@ -10,6 +10,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "scratch_folder.h"
 #include "tool_error.h"
 
 namespace vexmap_host {
@@ -23,16 +24,8 @@ constexpr int MODE_COUNT = 17;
 
 class PluginHostTest : public ::testing::Test {
 protected:
-    void SetUp() override {
-        directory = std::filesystem::path(::testing::TempDir()) /
-                    ("vexmap-plugin-host-" +
-                     std::string(::testing::UnitTest::GetInstance()->current_test_info()->name()) +
-                     "-" + std::to_string(getpid()));
-        std::filesystem::create_directories(directory);
-    }
-    void TearDown() override { std::filesystem::remove_all(directory); }
-
-    std::filesystem::path directory;
+    ScratchFolder const scratch{"vexmap-plugin-host-"};
+    std::filesystem::path const directory = scratch.Path();
 };
 
 TEST(PluginHost, RegistryCountsSeventeenModes) {

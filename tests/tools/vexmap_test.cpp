@@ -25,6 +25,7 @@
 #include "pixel_format.h"
 #include "rgb_image.h"
 #include "sample_scene.h"
+#include "scratch_folder.h"
 #include "y4m_reader.h"
 #include "y4m_writer.h"
 #include "yuv_image.h"
@@ -177,17 +178,7 @@ Outcome Wait(pid_t child) {
 
 class VexmapTest : public ::testing::Test {
 protected:
-    void SetUp() override {
-        directory = std::filesystem::path(::testing::TempDir()) /
-                    ("vexmap-tool-" +
-                     std::string(::testing::UnitTest::GetInstance()->current_test_info()->name()) +
-                     "-" + std::to_string(getpid()));
-        std::filesystem::remove_all(directory);
-        std::filesystem::create_directories(directory);
-    }
-    void TearDown() override { std::filesystem::remove_all(directory); }
-
-    std::string PathOf(std::string const& name) const { return (directory / name).string(); }
+    std::string PathOf(std::string const& name) const { return scratch.PathOf(name); }
 
     // Runs the built tool with standard output and error captured in files of the test, and
     // standard input read from a file (nothing by default), in the test's working directory
@@ -280,7 +271,8 @@ protected:
         return outcome;
     }
 
-    std::filesystem::path directory;
+    ScratchFolder const scratch{"vexmap-tool-"};
+    std::filesystem::path const directory = scratch.Path();
     std::vector<std::string> added_environment;  // for the tool started by Run
 };
 
