@@ -11,7 +11,7 @@ set -euo pipefail
 build_packages=(
     build-essential g++ cmake ninja-build pkg-config binutils
     libboost-dev libgtest-dev libgmock-dev libbenchmark-dev
-    libpng-dev zlib1g-dev libturbojpeg0-dev libjpeg62-turbo-dev libcli11-dev
+    libsleef-dev libpng-dev zlib1g-dev libturbojpeg0-dev libjpeg62-turbo-dev libcli11-dev
     help2man
 )
 test_packages=(

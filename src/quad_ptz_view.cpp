@@ -1,7 +1,10 @@
 #include "vexmap/quad_ptz_view.h"
 
+#include <vector>
+
 #include <boost/shared_ptr.hpp>
 
+#include "vexmap/batch_chain.h"
 #include "vexmap/log.h"
 #include "vexmap/map_functors.h"
 #include "vexmap/performance_timer.h"
@@ -12,13 +15,6 @@ namespace quorvel::vexmap {
 namespace {
 
 constexpr int SPAN = 8;
-
-// One cursor a pane, with the last point stored through the pane's own turn.
-struct Pane {
-    boost::shared_ptr<MapFunctor> turn;
-    unsigned short* cursor;
-    Vector2d last;
-};
 
 }  // namespace
 
@@ -77,58 +73,70 @@ MapFunctor* QuadPtzView::GetPtzPane(float pan_offset) {
 // The scale and projection run once for the four panes; each pane's turn follows. A pane walks
 // a quarter of the output and samples the whole crop at half size, two crop pixels an output
 // pixel. The span ends differ on purpose: the left panes run on to x = 8 and overwrite the first
-// columns of the right panes, which stop at the last x below 0.
+// columns of the right panes, which stop at the last x below 0. So the first points are stored
+// in pane order, then the right panes' spans, then the left panes', which win where they meet.
 void QuadPtzView::BuildQuadMap() {
     PerformanceTimer timer("One stage map build");
     timer.Start();
     MapFunctors chain;
-    Pane panes[4] = {{boost::shared_ptr<MapFunctor>(GetPtzFunctor()), nullptr, Vector2d()},
-                     {boost::shared_ptr<MapFunctor>(GetPtzPane2()), nullptr, Vector2d()},
-                     {boost::shared_ptr<MapFunctor>(GetPtzPane3()), nullptr, Vector2d()},
-                     {boost::shared_ptr<MapFunctor>(GetPtzPane4()), nullptr, Vector2d()}};
+    boost::shared_ptr<MapFunctor> const turns[4] = {boost::shared_ptr<MapFunctor>(GetPtzFunctor()),
+                                                    boost::shared_ptr<MapFunctor>(GetPtzPane2()),
+                                                    boost::shared_ptr<MapFunctor>(GetPtzPane3()),
+                                                    boost::shared_ptr<MapFunctor>(GetPtzPane4())};
     Vector2d const crop = GetCropSize();
     chain.PushBack(GetScaleFunctor(crop));
     chain.PushBack(GetProjectionFunctor());
+    BatchChain shared(chain);
+    BatchChain panes[4] = {BatchChain(*turns[0]), BatchChain(*turns[1]), BatchChain(*turns[2]),
+                           BatchChain(*turns[3])};
     MapWalk const walk = StartMapWalk(crop);
     boost::shared_ptr<SimpleImageMap> const& map = walk.map;
-    Vector2d const& centre = walk.centre;
     int const left = walk.left;
-    int const right = walk.right;
-    int const top = walk.top;
     int const left_column = static_cast<int>(float(left) + walk.origin.x);
     int const right_column = static_cast<int>(walk.origin.x);
     // The left panes' last spans reach 8 columns past the middle; on an output too narrow to
     // hold them they would run past the row, so there they stop at the row's end.
     int const last_left_span = map->GetMapWidth() - 1 - left_column + left;
+    // Spans end at x = left + 8k: up to 8 for all, up to the row's end for the left panes, and
+    // below 0 for the right ones.
+    int const all_spans = (SPAN - left) / SPAN;
+    int const left_limit = last_left_span < SPAN ? last_left_span : SPAN;
+    int const left_spans = left_limit < left + SPAN ? 0 : (left_limit - left) / SPAN;
+    int const right_spans = left <= -1 ? (-1 - left) / SPAN : 0;
+    int const spans[4] = {left_spans, right_spans, left_spans, right_spans};
+    int const samples = 1 + all_spans;
+    std::vector<float> sample_x(static_cast<std::size_t>(samples));
+    std::vector<float> sample_y(static_cast<std::size_t>(samples));
+    std::vector<float> pane_x(4 * std::size_t(samples));
+    std::vector<float> pane_y(4 * std::size_t(samples));
     for (int y = walk.bottom; y < 0 && HasEntries(*map); ++y) {
-        int x_in = right + 2 * left;
-        int const y_in = top + 2 * y;
-        int const row = static_cast<int>(walk.origin.y) + y;
-        panes[0].cursor = EntryAt(*map, left_column, row);
-        panes[1].cursor = EntryAt(*map, right_column, row);
-        panes[2].cursor = EntryAt(*map, left_column, row + top);
-        panes[3].cursor = EntryAt(*map, right_column, row + top);
-        Vector2d const first = chain.Call(Vector2d(float(x_in), float(y_in)));
-        for (Pane& pane : panes) {
-            pane.last = pane.turn->Call(first);
-            StorePoint(pane.cursor, pane.last, centre);
+        int const x_in = walk.right + 2 * left;
+        int const y_in = walk.top + 2 * y;
+        for (int k = 0; k < samples; ++k) {
+            sample_x[std::size_t(k)] = float(x_in + 2 * SPAN * k);
+            sample_y[std::size_t(k)] = float(y_in);
         }
-        auto advance = [&](Pane& pane, Vector2d const& sample) {
-            Vector2d const next = pane.turn->Call(sample);
-            StoreSpan(pane.cursor, pane.last, next, centre, SPAN);
-            pane.last = next;
-        };
-        for (int x = left + SPAN; x <= SPAN; x += SPAN) {
-            x_in += 2 * SPAN;
-            Vector2d const sample = chain.Call(Vector2d(float(x_in), float(y_in)));
-            if (x <= last_left_span) {
-                advance(panes[0], sample);
-                advance(panes[2], sample);
+        shared.Run(sample_x.data(), sample_y.data(), samples);
+        int const row = static_cast<int>(walk.origin.y) + y;
+        unsigned short* cursors[4] = {EntryAt(*map, left_column, row),
+                                      EntryAt(*map, right_column, row),
+                                      EntryAt(*map, left_column, row + walk.top),
+                                      EntryAt(*map, right_column, row + walk.top)};
+        float* xs[4];
+        float* ys[4];
+        for (int pane = 0; pane < 4; ++pane) {
+            xs[pane] = pane_x.data() + std::size_t(pane) * std::size_t(samples);
+            ys[pane] = pane_y.data() + std::size_t(pane) * std::size_t(samples);
+            int const points = 1 + spans[pane];
+            for (int k = 0; k < points; ++k) {
+                xs[pane][k] = sample_x[std::size_t(k)];
+                ys[pane][k] = sample_y[std::size_t(k)];
             }
-            if (x < 0) {
-                advance(panes[1], sample);
-                advance(panes[3], sample);
-            }
+            panes[pane].Run(xs[pane], ys[pane], points);
+            StoreRow(cursors[pane], xs[pane], ys[pane], 1, walk.centre, SPAN);
+        }
+        for (int const pane : {1, 3, 0, 2}) {
+            StoreSpans(cursors[pane], xs[pane], ys[pane], 1 + spans[pane], walk.centre, SPAN);
         }
     }
     image_map = map;

@@ -2,11 +2,14 @@
 
 #include <cerrno>
 #include <cstdint>
+#include <vector>
 
 #if defined(__SSE2__)
 #include <emmintrin.h>
 #endif
 
+#include "vexmap/batch_chain.h"
+#include "vexmap/batch_lanes.h"
 #include "vexmap/code_location.h"
 #include "vexmap/error.h"
 #include "vexmap/floating_point.h"
@@ -22,10 +25,8 @@ namespace quorvel::vexmap {
 
 namespace {
 
-// Below 2^22 in magnitude, adding and taking away 1.5 * 2^23 rounds a float to the nearest
-// integer, ties to even, exactly as nearbyint does in the default rounding mode, with no call.
-constexpr float NEAR_LIMIT = 4194304.0f;
-constexpr float ROUNDER = 12582912.0f;
+constexpr float NEAR_LIMIT = BatchLanes::NEAR_LIMIT;
+constexpr float ROUNDER = BatchLanes::ROUNDER;
 
 // Both tests always run, so that a run of them needs no branch.
 bool IsNear(float coordinate) {
@@ -140,6 +141,44 @@ bool StoreEighthSpanWide(unsigned short* cursor, SpanPoint const& first, SpanPoi
     return true;
 }
 #endif
+
+void StoreHalvedSpan(unsigned short*& cursor, SpanPoint const& first, SpanPoint const& last,
+                     float cx, float cy, int step) {
+    if (step == 1) {
+        float const words[2] = {last.x + cx, last.y + cy};
+        StoreWords(cursor, words);
+    } else if (step == 2) {
+        SpanPoint const m = Half(first, last);
+        float const words[4] = {m.x + cx, m.y + cy, last.x + cx, last.y + cy};
+        StoreWords(cursor, words);
+    } else if (step == 4) {
+        SpanPoint const m2 = Half(first, last);
+        SpanPoint const m1 = Half(first, m2);
+        SpanPoint const m3 = Half(m2, last);
+        float const words[8] = {m1.x + cx, m1.y + cy, m2.x + cx,   m2.y + cy,
+                                m3.x + cx, m3.y + cy, last.x + cx, last.y + cy};
+        StoreWords(cursor, words);
+    } else {
+#if defined(__SSE2__)
+        if (StoreEighthSpanWide(cursor, first, last, cx, cy)) {
+            cursor += 16;
+            return;
+        }
+#endif
+        SpanPoint const m4 = Half(first, last);
+        SpanPoint const m2 = Half(first, m4);
+        SpanPoint const m6 = Half(m4, last);
+        SpanPoint const m1 = Half(first, m2);
+        SpanPoint const m3 = Half(m2, m4);
+        SpanPoint const m5 = Half(m4, m6);
+        SpanPoint const m7 = Half(m6, last);
+        float const words[16] = {m1.x + cx, m1.y + cy, m2.x + cx,   m2.y + cy,
+                                 m3.x + cx, m3.y + cy, m4.x + cx,   m4.y + cy,
+                                 m5.x + cx, m5.y + cy, m6.x + cx,   m6.y + cy,
+                                 m7.x + cx, m7.y + cy, last.x + cx, last.y + cy};
+        StoreWords(cursor, words);
+    }
+}
 
 }  // namespace
 
@@ -342,6 +381,8 @@ void View::BuildStepMap(int step) {
     BuildShiftedMap(crop, crop, step, [](int, int, int) { return Vector2d(); });
 }
 
+// The points of a row go through the chain together, every step-th column from the left edge,
+// and are then stored with the columns between halved.
 void View::BuildShiftedMap(Vector2d const& scale_crop, Vector2d const& area_size, int step,
                            RowShift shift) {
     PerformanceTimer timer("One stage map build");
@@ -350,20 +391,25 @@ void View::BuildShiftedMap(Vector2d const& scale_crop, Vector2d const& area_size
     chain.PushBack(GetScaleFunctor(scale_crop));
     chain.PushBack(GetProjectionFunctor());
     chain.PushBack(GetPtzFunctor());
+    BatchChain batch(chain);
     MapWalk const walk = StartMapWalk(area_size);
     int const column = static_cast<int>(float(walk.left) + walk.origin.x);
+    // The first point and one a whole span: the span loop runs while its end is below the right.
+    int const spans = walk.right > walk.left + step ? (walk.right - walk.left - 1) / step : 0;
+    int const points = 1 + spans;
+    std::vector<float> xs(static_cast<std::size_t>(points));
+    std::vector<float> ys(static_cast<std::size_t>(points));
     for (int y = walk.bottom; y < walk.top && HasEntries(*walk.map); ++y) {
         Vector2d const row_shift = shift(y, walk.left, walk.bottom);
         float const y_in = float(y) + row_shift.y;
+        for (int k = 0; k < points; ++k) {
+            xs[std::size_t(k)] = float(walk.left + k * step) + row_shift.x;
+            ys[std::size_t(k)] = y_in;
+        }
+        batch.Run(xs.data(), ys.data(), points);
         unsigned short* cursor =
             EntryAt(*walk.map, column, static_cast<int>(float(y) + walk.origin.y));
-        Vector2d p = chain.Call(Vector2d(float(walk.left) + row_shift.x, y_in));
-        StorePoint(cursor, p, walk.centre);
-        for (int x = walk.left + step; x < walk.right; x += step) {
-            Vector2d const q = chain.Call(Vector2d(float(x) + row_shift.x, y_in));
-            StoreSpan(cursor, p, q, walk.centre, step);
-            p = q;
-        }
+        StoreRow(cursor, xs.data(), ys.data(), points, walk.centre, step);
     }
     image_map = walk.map;
     timer.Finish();
@@ -434,43 +480,42 @@ void View::StorePoint(unsigned short*& cursor, Vector2d const& point, Vector2d c
 // eight entries of a map.
 void View::StoreSpan(unsigned short*& cursor, Vector2d const& p, Vector2d const& q,
                      Vector2d const& centre, int step) {
-    SpanPoint const first{p.x, p.y};
-    SpanPoint const last{q.x, q.y};
-    float const cx = centre.x;
-    float const cy = centre.y;
-    if (step == 1) {
-        float const words[2] = {last.x + cx, last.y + cy};
-        StoreWords(cursor, words);
-    } else if (step == 2) {
-        SpanPoint const m = Half(first, last);
-        float const words[4] = {m.x + cx, m.y + cy, last.x + cx, last.y + cy};
-        StoreWords(cursor, words);
-    } else if (step == 4) {
-        SpanPoint const m2 = Half(first, last);
-        SpanPoint const m1 = Half(first, m2);
-        SpanPoint const m3 = Half(m2, last);
-        float const words[8] = {m1.x + cx, m1.y + cy, m2.x + cx,   m2.y + cy,
-                                m3.x + cx, m3.y + cy, last.x + cx, last.y + cy};
-        StoreWords(cursor, words);
-    } else {
-#if defined(__SSE2__)
-        if (StoreEighthSpanWide(cursor, first, last, cx, cy)) {
-            cursor += 16;
-            return;
+    StoreHalvedSpan(cursor, SpanPoint{p.x, p.y}, SpanPoint{q.x, q.y}, centre.x, centre.y, step);
+}
+
+void View::StoreRow(unsigned short*& cursor, float const* x, float const* y, int count,
+                    Vector2d const& centre, int step) {
+    if (count <= 0) {
+        return;
+    }
+    float const first[2] = {x[0] + centre.x, y[0] + centre.y};
+    StoreWords(cursor, first);
+    StoreSpans(cursor, x, y, count, centre, step);
+}
+
+// Spans of 8 go to the widest lanes first; a span they stop at, with a far coordinate, is stored
+// here, and they go on from the next.
+void View::StoreSpans(unsigned short*& cursor, float const* x, float const* y, int count,
+                      Vector2d const& centre, int step) {
+    int k = 1;
+    if (step == 8) {
+        BatchLanes const& lanes = BatchLanes::Widest();
+        while (k < count) {
+            int const done = lanes.store_eighth_spans(cursor, x + k - 1, y + k - 1, count - k + 1,
+                                                      centre.x, centre.y);
+            cursor += 16 * done;
+            k += done;
+            if (k < count) {
+                StoreHalvedSpan(cursor, SpanPoint{x[k - 1], y[k - 1]}, SpanPoint{x[k], y[k]},
+                                centre.x, centre.y, step);
+                ++k;
+            }
         }
-#endif
-        SpanPoint const m4 = Half(first, last);
-        SpanPoint const m2 = Half(first, m4);
-        SpanPoint const m6 = Half(m4, last);
-        SpanPoint const m1 = Half(first, m2);
-        SpanPoint const m3 = Half(m2, m4);
-        SpanPoint const m5 = Half(m4, m6);
-        SpanPoint const m7 = Half(m6, last);
-        float const words[16] = {m1.x + cx, m1.y + cy, m2.x + cx,   m2.y + cy,
-                                 m3.x + cx, m3.y + cy, m4.x + cx,   m4.y + cy,
-                                 m5.x + cx, m5.y + cy, m6.x + cx,   m6.y + cy,
-                                 m7.x + cx, m7.y + cy, last.x + cx, last.y + cy};
-        StoreWords(cursor, words);
+        return;
+    }
+    for (; k < count; ++k) {
+        StoreHalvedSpan(cursor, SpanPoint{x[k - 1], y[k - 1]}, SpanPoint{x[k], y[k]}, centre.x,
+                        centre.y, step);
     }
 }
 

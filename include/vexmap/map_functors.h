@@ -25,6 +25,8 @@ public:
     void PushBack(MapFunctor* link);  // takes ownership
     void PushFront(boost::shared_ptr<MapFunctor> const& link);
     void PushFront(MapFunctor* link);  // takes ownership
+    /// The links in the order of application, for a builder that runs them on many points.
+    std::list<boost::shared_ptr<MapFunctor>> const& GetLinks() const { return chain; }
 
 private:
     std::list<boost::shared_ptr<MapFunctor>> chain;

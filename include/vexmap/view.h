@@ -96,6 +96,12 @@ protected:
     /// The step is 1, 2, 4 or 8.
     static void StoreSpan(unsigned short*& cursor, Vector2d const& p, Vector2d const& q,
                           Vector2d const& centre, int step);
+    /// Stores the first of count points as StorePoint does, then StoreSpans of all of them.
+    static void StoreRow(unsigned short*& cursor, float const* x, float const* y, int count,
+                         Vector2d const& centre, int step);
+    /// Stores the span from each point to the next as StoreSpan does: count - 1 spans.
+    static void StoreSpans(unsigned short*& cursor, float const* x, float const* y, int count,
+                           Vector2d const& centre, int step);
     /// Where a builder walks: a blank map of the output's size for the camera's image, the
     /// image's centre (added to every point), the output's centre, and the edges of the area it
     /// covers, centred on the origin and truncated toward zero.

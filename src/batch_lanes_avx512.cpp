@@ -1,0 +1,225 @@
+// AVX-512F, 16 lanes. Compiled with -mavx512f: nothing here may run before Supported() has said
+// yes, so everything but the table itself has internal linkage.
+#include <cstdint>
+#include <immintrin.h>
+#include <sleef.h>
+
+#include "vexmap/batch_lane_kernels.h"
+
+namespace quorvel::vexmap {
+namespace {
+
+struct Avx512Lane {
+    using Pack = __m512;
+    static constexpr int WIDTH = 16;
+    static Pack Load(float const* p) { return _mm512_loadu_ps(p); }
+    static void Store(float* p, Pack v) { _mm512_storeu_ps(p, v); }
+    static Pack Fill(float v) { return _mm512_set1_ps(v); }
+    // Masks are kept as all-ones lanes so that the shared kernels can combine them as packs.
+    static Pack FromMask(__mmask16 mask) {
+        return _mm512_castsi512_ps(_mm512_maskz_set1_epi32(mask, -1));
+    }
+    static __mmask16 ToMask(Pack v) {
+        return _mm512_test_epi32_mask(_mm512_castps_si512(v), _mm512_castps_si512(v));
+    }
+    static Pack LessEqual(Pack a, Pack b) { return FromMask(_mm512_cmp_ps_mask(a, b, _CMP_LE_OQ)); }
+    static Pack GreaterEqual(Pack a, Pack b) {
+        return FromMask(_mm512_cmp_ps_mask(a, b, _CMP_GE_OQ));
+    }
+    static Pack Or(Pack a, Pack b) {
+        return _mm512_castsi512_ps(_mm512_or_si512(_mm512_castps_si512(a), _mm512_castps_si512(b)));
+    }
+    static Pack Select(Pack mask, Pack yes, Pack no) {
+        return _mm512_mask_blend_ps(ToMask(mask), no, yes);
+    }
+    static Pack IsInfinite(Pack v) {
+        Pack const magnitude = _mm512_abs_ps(v);
+        return FromMask(
+            _mm512_cmp_ps_mask(magnitude, _mm512_set1_ps(__builtin_inff()), _CMP_EQ_OQ));
+    }
+    // Squares of floats are exact in double; the sum and the root round once each.
+    static __m256 Hypot8(__m256 a, __m256 b) {
+        __m512d const x = _mm512_cvtps_pd(a);
+        __m512d const y = _mm512_cvtps_pd(b);
+        return _mm512_cvtpd_ps(
+            _mm512_sqrt_pd(_mm512_add_pd(_mm512_mul_pd(x, x), _mm512_mul_pd(y, y))));
+    }
+    static __m256 High(Pack v) {
+        return _mm256_castpd_ps(_mm512_extractf64x4_pd(_mm512_castps_pd(v), 1));
+    }
+    static Pack Hypot(Pack a, Pack b) {
+        __m256 const low = Hypot8(_mm512_castps512_ps256(a), _mm512_castps512_ps256(b));
+        __m256 const high = Hypot8(High(a), High(b));
+        return _mm512_castpd_ps(_mm512_insertf64x4(_mm512_castps_pd(_mm512_castps256_ps512(low)),
+                                                   _mm256_castps_pd(high), 1));
+    }
+    static Pack Sin(Pack v) { return Sleef_sinf16_u10avx512f(v); }
+    static Pack Cos(Pack v) { return Sleef_cosf16_u10avx512f(v); }
+    static Pack Tan(Pack v) { return Sleef_tanf16_u10avx512f(v); }
+    static Pack Atan(Pack v) { return Sleef_atanf16_u10avx512f(v); }
+    static Pack Atan2(Pack y, Pack x) { return Sleef_atan2f16_u10avx512f(y, x); }
+    static Pack Asin(Pack v) { return Sleef_asinf16_u10avx512f(v); }
+    static Pack Acos(Pack v) { return Sleef_acosf16_u10avx512f(v); }
+    static Pack Sinh(Pack v) { return Sleef_sinhf16_u10avx512f(v); }
+    static Pack Log(Pack v) { return Sleef_logf16_u10avx512f(v); }
+
+    // The point (x, y) in every pair of lanes.
+    static Pack Pair(float const* x, float const* y) {
+        __m128 const pair = _mm_unpacklo_ps(_mm_load_ss(x), _mm_load_ss(y));
+        return _mm512_castpd_ps(_mm512_broadcastsd_pd(_mm_castps_pd(pair)));
+    }
+    // One span: all seven halvings in every lane, then each pair of lanes takes its own: lanes 0
+    // and 1 are m1, 2 and 3 m2, and so on to q in 14 and 15, the order of the table's words.
+    static bool StoreOneSpan(unsigned short* cursor, float const* x, float const* y, Pack centre) {
+        Pack const half = _mm512_set1_ps(0.5f);
+        Pack const p = Pair(x, y);
+        Pack const q = Pair(x + 1, y + 1);
+        Pack const m4 = _mm512_mul_ps(_mm512_add_ps(p, q), half);
+        Pack const m2 = _mm512_mul_ps(_mm512_add_ps(p, m4), half);
+        Pack const m6 = _mm512_mul_ps(_mm512_add_ps(m4, q), half);
+        Pack const m1 = _mm512_mul_ps(_mm512_add_ps(p, m2), half);
+        Pack const m3 = _mm512_mul_ps(_mm512_add_ps(m2, m4), half);
+        Pack const m5 = _mm512_mul_ps(_mm512_add_ps(m4, m6), half);
+        Pack const m7 = _mm512_mul_ps(_mm512_add_ps(m6, q), half);
+        Pack points = _mm512_mask_blend_ps(0x000C, m1, m2);
+        points = _mm512_mask_blend_ps(0x0030, points, m3);
+        points = _mm512_mask_blend_ps(0x00C0, points, m4);
+        points = _mm512_mask_blend_ps(0x0300, points, m5);
+        points = _mm512_mask_blend_ps(0x0C00, points, m6);
+        points = _mm512_mask_blend_ps(0x3000, points, m7);
+        points = _mm512_mask_blend_ps(0xC000, points, q);
+        points = _mm512_add_ps(points, centre);
+        if (Near(points) != 0xFFFF) {
+            return false;
+        }
+        _mm256_storeu_si256(reinterpret_cast<__m256i*>(cursor),
+                            _mm512_cvtepi32_epi16(Whole(points)));
+        return true;
+    }
+    static __mmask16 Near(Pack points) {
+        return _mm512_cmp_ps_mask(_mm512_abs_ps(points), _mm512_set1_ps(BatchLanes::NEAR_LIMIT),
+                                  _CMP_LT_OQ);
+    }
+    // Rounded to the nearest, ties to even, which is what adding and taking away the rounder
+    // does for a near value; above the largest word it is that word.
+    static __m512i Whole(Pack points) {
+        __m512i const whole =
+            _mm512_cvt_roundps_epi32(points, _MM_FROUND_TO_NEAREST_INT | _MM_FROUND_NO_EXC);
+        return _mm512_min_epi32(whole, _mm512_set1_epi32(65535));
+    }
+    // The entries of one halved point of 16 spans, x in the low word and y in the high one.
+    static __m512i Entries(Pack x, Pack y, Pack cx, Pack cy, __mmask16& near) {
+        x = _mm512_add_ps(x, cx);
+        y = _mm512_add_ps(y, cy);
+        near = _kand_mask16(near, _kand_mask16(Near(x), Near(y)));
+        return _mm512_or_si512(_mm512_and_si512(Whole(x), _mm512_set1_epi32(0xFFFF)),
+                               _mm512_slli_epi32(Whole(y), 16));
+    }
+    // Sixteen spans with the points in lanes: the halvings of x and of y, eight entries a span
+    // by lanes, then an 8 x 8 transpose in each half so that every span's entries lie together.
+    static bool StoreSixteenSpans(unsigned short* cursor, float const* x, float const* y, Pack cx,
+                                  Pack cy) {
+        Pack const half = _mm512_set1_ps(0.5f);
+        __m512i e[8];
+        __mmask16 near = 0xFFFF;
+        {
+            Pack const p = _mm512_loadu_ps(x);
+            Pack const q = _mm512_loadu_ps(x + 1);
+            Pack const m4 = _mm512_mul_ps(_mm512_add_ps(p, q), half);
+            Pack const m2 = _mm512_mul_ps(_mm512_add_ps(p, m4), half);
+            Pack const m6 = _mm512_mul_ps(_mm512_add_ps(m4, q), half);
+            Pack const py = _mm512_loadu_ps(y);
+            Pack const qy = _mm512_loadu_ps(y + 1);
+            Pack const n4 = _mm512_mul_ps(_mm512_add_ps(py, qy), half);
+            Pack const n2 = _mm512_mul_ps(_mm512_add_ps(py, n4), half);
+            Pack const n6 = _mm512_mul_ps(_mm512_add_ps(n4, qy), half);
+            e[0] = Entries(_mm512_mul_ps(_mm512_add_ps(p, m2), half),
+                           _mm512_mul_ps(_mm512_add_ps(py, n2), half), cx, cy, near);
+            e[1] = Entries(m2, n2, cx, cy, near);
+            e[2] = Entries(_mm512_mul_ps(_mm512_add_ps(m2, m4), half),
+                           _mm512_mul_ps(_mm512_add_ps(n2, n4), half), cx, cy, near);
+            e[3] = Entries(m4, n4, cx, cy, near);
+            e[4] = Entries(_mm512_mul_ps(_mm512_add_ps(m4, m6), half),
+                           _mm512_mul_ps(_mm512_add_ps(n4, n6), half), cx, cy, near);
+            e[5] = Entries(m6, n6, cx, cy, near);
+            e[6] = Entries(_mm512_mul_ps(_mm512_add_ps(m6, q), half),
+                           _mm512_mul_ps(_mm512_add_ps(n6, qy), half), cx, cy, near);
+            e[7] = Entries(q, qy, cx, cy, near);
+        }
+        if (near != 0xFFFF) {
+            return false;
+        }
+        Pack a[8];
+        for (int i = 0; i < 8; ++i) {
+            a[i] = _mm512_castsi512_ps(e[i]);
+        }
+        // Within each 128-bit lane: u[m] holds entries 0-3 of span m of the lane's four spans,
+        // u[m + 4] entries 4-7.
+        Pack t[8];
+        for (int i = 0; i < 4; ++i) {
+            t[2 * i] = _mm512_unpacklo_ps(a[2 * i], a[2 * i + 1]);
+            t[2 * i + 1] = _mm512_unpackhi_ps(a[2 * i], a[2 * i + 1]);
+        }
+        Pack u[8];
+        for (int half_index = 0; half_index < 2; ++half_index) {
+            Pack const* tt = t + 4 * half_index;
+            u[4 * half_index + 0] = _mm512_shuffle_ps(tt[0], tt[2], 0x44);
+            u[4 * half_index + 1] = _mm512_shuffle_ps(tt[0], tt[2], 0xEE);
+            u[4 * half_index + 2] = _mm512_shuffle_ps(tt[1], tt[3], 0x44);
+            u[4 * half_index + 3] = _mm512_shuffle_ps(tt[1], tt[3], 0xEE);
+        }
+        // Lanes 0 and 2 of the two halves make spans m and m + 8; lanes 1 and 3 spans m + 4 and
+        // m + 12.
+        __m512i const even =
+            _mm512_setr_epi32(0, 1, 2, 3, 16, 17, 18, 19, 8, 9, 10, 11, 24, 25, 26, 27);
+        __m512i const odd =
+            _mm512_setr_epi32(4, 5, 6, 7, 20, 21, 22, 23, 12, 13, 14, 15, 28, 29, 30, 31);
+        for (int m = 0; m < 4; ++m) {
+            Pack const first = _mm512_permutex2var_ps(u[m], even, u[m + 4]);
+            Pack const second = _mm512_permutex2var_ps(u[m], odd, u[m + 4]);
+            StoreHalves(cursor, m, first);
+            StoreHalves(cursor, m + 4, second);
+        }
+        return true;
+    }
+    static void StoreHalves(unsigned short* cursor, int span, Pack entries) {
+        __m512d const both = _mm512_castps_pd(entries);
+        _mm256_storeu_pd(reinterpret_cast<double*>(cursor + 16 * span),
+                         _mm512_castpd512_pd256(both));
+        _mm256_storeu_pd(reinterpret_cast<double*>(cursor + 16 * (span + 8)),
+                         _mm512_extractf64x4_pd(both, 1));
+    }
+    static int StoreEighthSpans(unsigned short* cursor, float const* x, float const* y, int count,
+                                float cx, float cy) {
+        Pack const centre_x = _mm512_set1_ps(cx);
+        Pack const centre_y = _mm512_set1_ps(cy);
+        Pack const centre = _mm512_castpd_ps(_mm512_set1_pd(
+            __builtin_bit_cast(double, (uint64_t(__builtin_bit_cast(uint32_t, cy)) << 32) |
+                                           __builtin_bit_cast(uint32_t, cx))));
+        int const spans = count - 1;
+        int done = 0;
+        while (done + 16 <= spans &&
+               StoreSixteenSpans(cursor + 16 * done, x + done, y + done, centre_x, centre_y)) {
+            done += 16;
+        }
+        while (done < spans && StoreOneSpan(cursor + 16 * done, x + done, y + done, centre)) {
+            ++done;
+        }
+        return done;
+    }
+};
+
+bool Avx512Supported() {
+    return __builtin_cpu_supports("avx512f");
+}
+
+constexpr BatchLanes AVX512_LANES =
+    lane_kernels::Kernels<Avx512Lane>::Table("avx512f", &Avx512Supported);
+
+}  // namespace
+
+BatchLanes const& BatchLanes::Avx512() {
+    return AVX512_LANES;
+}
+
+}  // namespace quorvel::vexmap
