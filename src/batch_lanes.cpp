@@ -12,6 +12,7 @@ namespace {
 struct Sse2Lane {
     using Pack = __m128;
     static constexpr int WIDTH = 4;
+    static void Leave() {}
     static Pack Load(float const* p) { return _mm_loadu_ps(p); }
     static void Store(float* p, Pack v) { _mm_storeu_ps(p, v); }
     static Pack Fill(float v) { return _mm_set1_ps(v); }
@@ -53,7 +54,7 @@ bool Always() {
     return true;
 }
 
-constexpr BatchLanes SSE2_LANES = lane_kernels::Kernels<Sse2Lane>::Table("sse2", &Always);
+constexpr BatchLanes SSE2_LANES = lane_kernels::Table<Sse2Lane>("sse2", &Always);
 
 BatchLanes const& Choose() {
     __builtin_cpu_init();

@@ -12,6 +12,22 @@ namespace {
 struct Avx512Lane {
     using Pack = __m512;
     static constexpr int WIDTH = 16;
+    // vzeroupper leaves registers 16 to 31 as they are; zeroing them by an instruction of their
+    // own width marks them clean.
+    static void Leave() {
+        asm volatile(
+            "vpxord %%zmm16, %%zmm16, %%zmm16\n\tvpxord %%zmm17, %%zmm17, %%zmm17\n\t"
+            "vpxord %%zmm18, %%zmm18, %%zmm18\n\tvpxord %%zmm19, %%zmm19, %%zmm19\n\t"
+            "vpxord %%zmm20, %%zmm20, %%zmm20\n\tvpxord %%zmm21, %%zmm21, %%zmm21\n\t"
+            "vpxord %%zmm22, %%zmm22, %%zmm22\n\tvpxord %%zmm23, %%zmm23, %%zmm23\n\t"
+            "vpxord %%zmm24, %%zmm24, %%zmm24\n\tvpxord %%zmm25, %%zmm25, %%zmm25\n\t"
+            "vpxord %%zmm26, %%zmm26, %%zmm26\n\tvpxord %%zmm27, %%zmm27, %%zmm27\n\t"
+            "vpxord %%zmm28, %%zmm28, %%zmm28\n\tvpxord %%zmm29, %%zmm29, %%zmm29\n\t"
+            "vpxord %%zmm30, %%zmm30, %%zmm30\n\tvpxord %%zmm31, %%zmm31, %%zmm31\n\t"
+            "vzeroupper" ::
+                : "xmm16", "xmm17", "xmm18", "xmm19", "xmm20", "xmm21", "xmm22", "xmm23", "xmm24",
+                  "xmm25", "xmm26", "xmm27", "xmm28", "xmm29", "xmm30", "xmm31");
+    }
     static Pack Load(float const* p) { return _mm512_loadu_ps(p); }
     static void Store(float* p, Pack v) { _mm512_storeu_ps(p, v); }
     static Pack Fill(float v) { return _mm512_set1_ps(v); }
@@ -117,19 +133,21 @@ struct Avx512Lane {
     }
     // Sixteen spans with the points in lanes: the halvings of x and of y, eight entries a span
     // by lanes, then an 8 x 8 transpose in each half so that every span's entries lie together.
+    // Up to sixteen spans: `spans` of them are read and stored, the lanes beyond are zeros.
     static bool StoreSixteenSpans(unsigned short* cursor, float const* x, float const* y, Pack cx,
-                                  Pack cy) {
+                                  Pack cy, int spans) {
+        __mmask16 const lanes = __mmask16((1u << spans) - 1u);
         Pack const half = _mm512_set1_ps(0.5f);
         __m512i e[8];
         __mmask16 near = 0xFFFF;
         {
-            Pack const p = _mm512_loadu_ps(x);
-            Pack const q = _mm512_loadu_ps(x + 1);
+            Pack const p = _mm512_maskz_loadu_ps(lanes, x);
+            Pack const q = _mm512_maskz_loadu_ps(lanes, x + 1);
             Pack const m4 = _mm512_mul_ps(_mm512_add_ps(p, q), half);
             Pack const m2 = _mm512_mul_ps(_mm512_add_ps(p, m4), half);
             Pack const m6 = _mm512_mul_ps(_mm512_add_ps(m4, q), half);
-            Pack const py = _mm512_loadu_ps(y);
-            Pack const qy = _mm512_loadu_ps(y + 1);
+            Pack const py = _mm512_maskz_loadu_ps(lanes, y);
+            Pack const qy = _mm512_maskz_loadu_ps(lanes, y + 1);
             Pack const n4 = _mm512_mul_ps(_mm512_add_ps(py, qy), half);
             Pack const n2 = _mm512_mul_ps(_mm512_add_ps(py, n4), half);
             Pack const n6 = _mm512_mul_ps(_mm512_add_ps(n4, qy), half);
@@ -177,17 +195,22 @@ struct Avx512Lane {
         for (int m = 0; m < 4; ++m) {
             Pack const first = _mm512_permutex2var_ps(u[m], even, u[m + 4]);
             Pack const second = _mm512_permutex2var_ps(u[m], odd, u[m + 4]);
-            StoreHalves(cursor, m, first);
-            StoreHalves(cursor, m + 4, second);
+            StoreHalves(cursor, m, first, spans);
+            StoreHalves(cursor, m + 4, second, spans);
         }
         return true;
     }
-    static void StoreHalves(unsigned short* cursor, int span, Pack entries) {
+    // The low half is span `span`, the high half span `span` + 8; only those below `spans`.
+    static void StoreHalves(unsigned short* cursor, int span, Pack entries, int spans) {
         __m512d const both = _mm512_castps_pd(entries);
-        _mm256_storeu_pd(reinterpret_cast<double*>(cursor + 16 * span),
-                         _mm512_castpd512_pd256(both));
-        _mm256_storeu_pd(reinterpret_cast<double*>(cursor + 16 * (span + 8)),
-                         _mm512_extractf64x4_pd(both, 1));
+        if (span < spans) {
+            _mm256_storeu_pd(reinterpret_cast<double*>(cursor + 16 * span),
+                             _mm512_castpd512_pd256(both));
+        }
+        if (span + 8 < spans) {
+            _mm256_storeu_pd(reinterpret_cast<double*>(cursor + 16 * (span + 8)),
+                             _mm512_extractf64x4_pd(both, 1));
+        }
     }
     static int StoreEighthSpans(unsigned short* cursor, float const* x, float const* y, int count,
                                 float cx, float cy) {
@@ -198,13 +221,18 @@ struct Avx512Lane {
                                            __builtin_bit_cast(uint32_t, cx))));
         int const spans = count - 1;
         int done = 0;
-        while (done + 16 <= spans &&
-               StoreSixteenSpans(cursor + 16 * done, x + done, y + done, centre_x, centre_y)) {
-            done += 16;
+        while (done < spans) {
+            int const block = spans - done < 16 ? spans - done : 16;
+            if (!StoreSixteenSpans(cursor + 16 * done, x + done, y + done, centre_x, centre_y,
+                                   block)) {
+                break;
+            }
+            done += block;
         }
         while (done < spans && StoreOneSpan(cursor + 16 * done, x + done, y + done, centre)) {
             ++done;
         }
+        Leave();
         return done;
     }
 };
@@ -213,8 +241,7 @@ bool Avx512Supported() {
     return __builtin_cpu_supports("avx512f");
 }
 
-constexpr BatchLanes AVX512_LANES =
-    lane_kernels::Kernels<Avx512Lane>::Table("avx512f", &Avx512Supported);
+constexpr BatchLanes AVX512_LANES = lane_kernels::Table<Avx512Lane>("avx512f", &Avx512Supported);
 
 }  // namespace
 

@@ -89,7 +89,7 @@ void QuadPtzView::BuildQuadMap() {
     BatchChain shared(chain);
     BatchChain panes[4] = {BatchChain(*turns[0]), BatchChain(*turns[1]), BatchChain(*turns[2]),
                            BatchChain(*turns[3])};
-    MapWalk const walk = StartMapWalk(crop);
+    MapWalk walk = StartMapWalk(crop);
     boost::shared_ptr<SimpleImageMap> const& map = walk.map;
     int const left = walk.left;
     int const left_column = static_cast<int>(float(left) + walk.origin.x);
@@ -118,6 +118,8 @@ void QuadPtzView::BuildQuadMap() {
         }
         shared.Run(sample_x.data(), sample_y.data(), samples);
         int const row = static_cast<int>(walk.origin.y) + y;
+        StartRow(walk, row);
+        StartRow(walk, row + walk.top);
         unsigned short* cursors[4] = {EntryAt(*map, left_column, row),
                                       EntryAt(*map, right_column, row),
                                       EntryAt(*map, left_column, row + walk.top),
@@ -139,6 +141,7 @@ void QuadPtzView::BuildQuadMap() {
             StoreSpans(cursors[pane], xs[pane], ys[pane], 1 + spans[pane], walk.centre, SPAN);
         }
     }
+    FinishRows(walk);
     image_map = map;
     timer.Finish();
 }

@@ -98,13 +98,17 @@ int64_t SimpleImageMap::WordCount(int width, int height) {
 }
 
 void SimpleImageMap::SetMapSize(int width, int height) {
+    ReserveMapSize(width, height);
+    std::memset(map.get(), 0xFF, size_t(WordCount(width, height)) * sizeof(unsigned short));
+}
+
+void SimpleImageMap::ReserveMapSize(int width, int height) {
     int64_t const words = WordCount(width, height);
     if (words < 0) {
         throw std::bad_array_new_length();
     }
     boost::shared_ptr<unsigned short> table(new unsigned short[size_t(words)],
                                             boost::checked_array_deleter<unsigned short>());
-    std::memset(table.get(), 0xFF, size_t(words) * sizeof(unsigned short));
     map = table;
     map_size = Resolution(width, height);
 }

@@ -1,7 +1,9 @@
 #include "vexmap/view.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdint>
+#include <cstring>
 #include <vector>
 
 #if defined(__SSE2__)
@@ -392,7 +394,7 @@ void View::BuildShiftedMap(Vector2d const& scale_crop, Vector2d const& area_size
     chain.PushBack(GetProjectionFunctor());
     chain.PushBack(GetPtzFunctor());
     BatchChain batch(chain);
-    MapWalk const walk = StartMapWalk(area_size);
+    MapWalk walk = StartMapWalk(area_size);
     int const column = static_cast<int>(float(walk.left) + walk.origin.x);
     // The first point and one a whole span: the span loop runs while its end is below the right.
     int const spans = walk.right > walk.left + step ? (walk.right - walk.left - 1) / step : 0;
@@ -407,10 +409,12 @@ void View::BuildShiftedMap(Vector2d const& scale_crop, Vector2d const& area_size
             ys[std::size_t(k)] = y_in;
         }
         batch.Run(xs.data(), ys.data(), points);
-        unsigned short* cursor =
-            EntryAt(*walk.map, column, static_cast<int>(float(y) + walk.origin.y));
+        int const row = static_cast<int>(float(y) + walk.origin.y);
+        StartRow(walk, row);
+        unsigned short* cursor = EntryAt(*walk.map, column, row);
         StoreRow(cursor, xs.data(), ys.data(), points, walk.centre, step);
     }
+    FinishRows(walk);
     image_map = walk.map;
     timer.Finish();
 }
@@ -430,7 +434,24 @@ View::MapWalk View::StartMapWalk(Vector2d const& area_size) const {
     walk.right = static_cast<int>(area.right);
     walk.bottom = static_cast<int>(area.bottom);
     walk.top = static_cast<int>(area.top);
+    walk.started.assign(std::size_t(std::max(walk.map->GetMapHeight(), 0)), 0);
     return walk;
+}
+
+void View::StartRow(MapWalk& walk, int row) {
+    int const width = walk.map->GetMapWidth();
+    if (row < 0 || std::size_t(row) >= walk.started.size() || walk.started[std::size_t(row)] != 0 ||
+        width <= 0) {
+        return;
+    }
+    walk.started[std::size_t(row)] = 1;
+    std::memset(EntryAt(*walk.map, 0, row), 0xFF, 2 * std::size_t(width) * sizeof(unsigned short));
+}
+
+void View::FinishRows(MapWalk& walk) {
+    for (std::size_t row = 0; row < walk.started.size(); ++row) {
+        StartRow(walk, int(row));
+    }
 }
 
 // The table's word count is a signed 32-bit product: an output whose count does not fit would
@@ -447,7 +468,9 @@ boost::shared_ptr<SimpleImageMap> View::NewImageMap() const {
         throw Error(CodeLocation("src/view", "View", "NewImageMap", __LINE__), ENOMEM,
                     "Invalid image map size");
     }
-    return boost::shared_ptr<SimpleImageMap>(new SimpleImageMap(dewarped_size));
+    boost::shared_ptr<SimpleImageMap> const map(new SimpleImageMap());
+    map->ReserveMapSize(static_cast<int>(width), static_cast<int>(height));
+    return map;
 }
 
 // An output without columns or rows has a table without entries: nothing may be written.

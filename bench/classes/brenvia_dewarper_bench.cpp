@@ -7,6 +7,7 @@
 #include <benchmark/benchmark.h>
 
 #include "BrenviaDewarper.h"
+#include "in_turns.h"
 #include "vexmap/channel.h"
 #include "vexmap/view.h"
 
@@ -45,8 +46,16 @@ public:
         GetImageOutputBuffer(&width, &height, &output, &size, &format);
         return output;
     }
+    /// One step of an operator's drag: the pan moves by a degree, round and round.
+    void MoveOn() {
+        pan_degrees = pan_degrees >= 179.0f ? -179.0f : pan_degrees + 1.0f;
+        SetPosition(pan_degrees, 40.0f, 1.0f);
+    }
     void* Channel() const { return channel; }
     unsigned char* Input() const { return inputBuffer; }
+
+private:
+    float pan_degrees = 0.0f;
 };
 
 _DEWARP_IMAGE Image(int width, int height, unsigned char* data) {
@@ -101,12 +110,6 @@ void BM_BrenviaDewarper_BareRemapOfTheSameMap(benchmark::State& state) {
 }
 BENCHMARK(BM_BrenviaDewarper_BareRemapOfTheSameMap)->Unit(benchmark::kMillisecond);
 
-double ThreadMilliseconds() {
-    timespec now{};
-    clock_gettime(CLOCK_THREAD_CPUTIME_ID, &now);
-    return double(now.tv_sec) * 1e3 + double(now.tv_nsec) * 1e-6;
-}
-
 // The two paths in turns, frame by frame, so that both meet the same state of a shared machine;
 // `overhead_percent` compares the fastest frame of each.
 void BM_BrenviaDewarper_OverheadInTurns(benchmark::State& state) {
@@ -118,12 +121,12 @@ void BM_BrenviaDewarper_OverheadInTurns(benchmark::State& state) {
     double best_plugin = 1e9;
     double best_bare = 1e9;
     for (auto _ : state) {
-        double const start = ThreadMilliseconds();
+        double const start = quorvel::vexmap::bench::ThreadMilliseconds();
         benchmark::DoNotOptimize(dewarper.Frame());
-        double const middle = ThreadMilliseconds();
+        double const middle = quorvel::vexmap::bench::ThreadMilliseconds();
         map->Remap(source, destination);
         benchmark::DoNotOptimize(output.data());
-        double const end = ThreadMilliseconds();
+        double const end = quorvel::vexmap::bench::ThreadMilliseconds();
         best_plugin = std::min(best_plugin, middle - start);
         best_bare = std::min(best_bare, end - middle);
     }
@@ -132,5 +135,40 @@ void BM_BrenviaDewarper_OverheadInTurns(benchmark::State& state) {
     state.counters["overhead_percent"] = (best_plugin - best_bare) / best_bare * 100.0;
 }
 BENCHMARK(BM_BrenviaDewarper_OverheadInTurns)->Iterations(200)->Unit(benchmark::kMillisecond);
+
+// A frame while the operator drags: the position moves before every frame, so every frame
+// builds the map anew and then remaps.
+void BM_BrenviaDewarper_FrameDuringPan(benchmark::State& state) {
+    ReadyDewarper dewarper;
+    for (auto _ : state) {
+        dewarper.MoveOn();
+        benchmark::DoNotOptimize(dewarper.Frame());
+        benchmark::ClobberMemory();
+    }
+    SetPixels(state);
+}
+BENCHMARK(BM_BrenviaDewarper_FrameDuringPan)->Unit(benchmark::kMillisecond);
+
+// A frame during a pan and a steady frame, in turns: `pan_over_steady` compares the fastest of
+// each, the figure that must stay at or below 2.
+void BM_BrenviaDewarper_PanFrameInTurns(benchmark::State& state) {
+    ReadyDewarper dewarper;
+    quorvel::vexmap::bench::Turns turns;
+    for (auto _ : state) {
+        quorvel::vexmap::bench::Turns const round = quorvel::vexmap::bench::InTurns(
+            1,
+            [&] {
+                dewarper.MoveOn();
+                benchmark::DoNotOptimize(dewarper.Frame());
+            },
+            [&] { benchmark::DoNotOptimize(dewarper.Frame()); });
+        turns.first_ms = std::min(turns.first_ms, round.first_ms);
+        turns.second_ms = std::min(turns.second_ms, round.second_ms);
+    }
+    state.counters["pan_ms"] = turns.first_ms;
+    state.counters["steady_ms"] = turns.second_ms;
+    state.counters["pan_over_steady"] = turns.Ratio();
+}
+BENCHMARK(BM_BrenviaDewarper_PanFrameInTurns)->Iterations(100)->Unit(benchmark::kMillisecond);
 
 }  // namespace

@@ -2,6 +2,7 @@
 
 #include <vector>
 
+#include "vexmap/batch_lanes.h"
 #include "vexmap/map_functor.h"
 #include "vexmap/projection.h"
 
@@ -27,35 +28,20 @@ public:
     void Run(float* x, float* y, int count);
 
 private:
+    /// A kernel of BatchLanes by its kind, or a link called point by point.
     enum StepKind {
-        AFFINE,
-        SPHERICAL_TURN,
-        RECTILINEAR_TO_FISHEYE,
-        CYLINDRICAL_TO_FISHEYE,
-        EQUIRECTANGULAR_TO_FISHEYE,
-        MERCATOR_TO_EQUIRECTANGULAR,
-        LAMBERT_TO_EQUIRECTANGULAR,
-        MILLER_TO_EQUIRECTANGULAR,
-        ARCHITECTURAL_TO_EQUIRECTANGULAR,
-        PANNINI_TO_EQUIRECTANGULAR,
-        EQUIRECTANGULAR_PANNINI_TO_EQUIRECTANGULAR,
-        CONVERSION,  // any other conversion of the grid, point by point
-        POINTWISE,   // any other link, point by point
+        CONVERSION = BatchLanes::CHAIN_KIND_COUNT,  // any other conversion of the grid
+        POINTWISE,                                  // any other link
     };
     struct Step {
-        StepKind kind;
-        float m[9];  // the affine or rotation matrix, rows first
-        float f;     // focal length
+        int kind;              // a BatchLanes::ChainKind or a StepKind
+        float parameters[10];  // matrix by rows, then the focal length
         ConversionFunction conversion;
         MapFunctor* link;
     };
 
     void AppendConversion(ConversionFunction conversion, float f);
-    void AppendStep(StepKind kind, float f);
-    void RunStep(Step const& step, float* x, float* y, int count);
-    float* Work(int index, int count) {
-        return work.data() + std::size_t(index) * std::size_t(count);
-    }
+    Step& AppendStep(int kind, float f);
 
     std::vector<Step> steps;
     std::vector<float> work;  // scratch arrays of one row, kept from row to row

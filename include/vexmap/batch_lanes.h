@@ -13,6 +13,24 @@ struct BatchLanes {
     static constexpr float ROUNDER = 12582912.0f;
 
     using Unary = void (*)(float const* x, float* out, int count);
+    /// A link of a map chain over arrays of points, in place: `parameters` holds the link's
+    /// matrix by rows and its focal length at index 9, `work` four arrays of `count` floats.
+    using ChainKernel = void (*)(float const* parameters, float* x, float* y, int count,
+                                 float* work);
+    enum ChainKind {
+        AFFINE,
+        SPHERICAL_TURN,
+        RECTILINEAR_TO_FISHEYE,
+        CYLINDRICAL_TO_FISHEYE,
+        EQUIRECTANGULAR_TO_FISHEYE,
+        MERCATOR_TO_EQUIRECTANGULAR,
+        LAMBERT_TO_EQUIRECTANGULAR,
+        MILLER_TO_EQUIRECTANGULAR,
+        ARCHITECTURAL_TO_EQUIRECTANGULAR,
+        PANNINI_TO_EQUIRECTANGULAR,
+        EQUIRECTANGULAR_PANNINI_TO_EQUIRECTANGULAR,
+        CHAIN_KIND_COUNT
+    };
     using Binary = void (*)(float const* a, float const* b, float* out, int count);
 
     char const* name;
@@ -34,6 +52,7 @@ struct BatchLanes {
     /// table stores none.
     int (*store_eighth_spans)(unsigned short* cursor, float const* x, float const* y, int count,
                               float cx, float cy);
+    ChainKernel chain[CHAIN_KIND_COUNT];
 
     static BatchLanes const& Sse2();
     static BatchLanes const& Avx2();

@@ -30,6 +30,9 @@ public:
     /// allocation throws and leaves this object as it was.
     void SetMapSize(int width, int height);
     void SetMapSize(Resolution const& size);
+    /// As SetMapSize, but the entries are left as the allocator gave them: for a builder that
+    /// writes or fills every entry itself, and saves the fill of a whole table.
+    void ReserveMapSize(int width, int height);
     Resolution GetMapSize() const;
     int GetMapWidth() const;
     int GetMapHeight() const;

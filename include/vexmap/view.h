@@ -1,5 +1,7 @@
 #pragma once
 
+#include <vector>
+
 #include <boost/shared_ptr.hpp>
 
 #include "vexmap/abstract_view.h"
@@ -113,9 +115,16 @@ protected:
         int right;
         int bottom;
         int top;
+        std::vector<unsigned char> started;  // per row of the map: filled by StartRow
     };
     MapWalk StartMapWalk(Vector2d const& area_size) const;
-    /// A blank map of the output's size; an output too large for a table throws ENOMEM.
+    /// The map's table is not filled when it is made: a builder fills each row with unmapped
+    /// entries just before it writes the row, while the row is in the cache, and FinishRows fills
+    /// the rows that it never started.
+    static void StartRow(MapWalk& walk, int row);
+    static void FinishRows(MapWalk& walk);
+    /// A map of the output's size whose entries are yet to be filled; an output too large for a
+    /// table throws ENOMEM.
     boost::shared_ptr<SimpleImageMap> NewImageMap() const;
     static bool HasEntries(SimpleImageMap const& map);
     /// The entry of the table at a column and row, in 32-bit arithmetic.

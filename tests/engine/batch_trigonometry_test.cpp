@@ -180,8 +180,72 @@ TEST_P(BatchLanesTest, EveryCountWorksInPlaceAndWritesNothingBeyondIt) {
     }
 }
 
+// XINUSE, the state components that hold something: bit 2 the upper halves of registers 0 to 15,
+// bit 6 the upper halves of their 512-bit forms, bit 7 registers 16 to 31. Zero when the processor
+// cannot tell.
+uint64_t StateInUse() {
+    uint32_t eax = 0xD;
+    uint32_t ebx = 0;
+    uint32_t ecx = 1;
+    uint32_t edx = 0;
+    asm volatile("cpuid" : "+a"(eax), "=b"(ebx), "+c"(ecx), "=d"(edx));
+    if ((eax & 4u) == 0) {
+        return 0;
+    }
+    uint32_t low = 0;
+    uint32_t high = 0;
+    asm volatile("xgetbv" : "=a"(low), "=d"(high) : "c"(1));
+    return (uint64_t(high) << 32) | low;
+}
+
+// With the wide registers' upper parts in use, a processor runs the plain SSE code that follows
+// (the host's own among it) several times slower: every function leaves them clean.
+class WideLanesTest : public testing::TestWithParam<BatchLanes const*> {};
+
+TEST_P(WideLanesTest, EveryFunctionLeavesTheWideRegistersClean) {
+    uint64_t const high_registers = std::string(GetParam()->name) == "avx512f" ? 1u << 7 : 0;
+    uint64_t const watched = (1u << 2) | (1u << 6) | high_registers;
+    std::vector<float> x(40, 0.25f);
+    std::vector<float> y(40, 0.5f);
+    std::vector<float> out(40);
+    std::vector<float> work(4 * 40);
+    std::vector<unsigned short> entries(16 * 40);
+    float parameters[10] = {1, 0, 0, 0, 1, 0, 0, 0, 1, 500};
+    BatchLanes const& lanes = *GetParam();
+    auto expect_clean = [&](char const* what) { EXPECT_EQ(0u, StateInUse() & watched) << what; };
+    for (BatchLanes::Unary const unary : {lanes.sin, lanes.cos, lanes.tan, lanes.atan, lanes.asin,
+                                          lanes.acos, lanes.sinh, lanes.log}) {
+        unary(x.data(), out.data(), 40);
+        expect_clean("a function of one argument");
+    }
+    lanes.atan2(y.data(), x.data(), out.data(), 40);
+    expect_clean("atan2");
+    lanes.hypot(y.data(), x.data(), out.data(), 40);
+    expect_clean("hypot");
+    lanes.store_eighth_spans(entries.data(), x.data(), y.data(), 40, 100.0f, 100.0f);
+    expect_clean("store_eighth_spans");
+    for (int kind = 0; kind < BatchLanes::CHAIN_KIND_COUNT; ++kind) {
+        lanes.chain[kind](parameters, x.data(), y.data(), 40, work.data());
+        expect_clean("a chain kernel");
+    }
+}
+
 INSTANTIATE_TEST_SUITE_P(EveryLaneWidthOfThisProcessor, BatchLanesTest,
                          testing::ValuesIn(AvailableLanes()),
+                         [](testing::TestParamInfo<BatchLanes const*> const& lanes) {
+                             return std::string(lanes.param->name);
+                         });
+
+std::vector<BatchLanes const*> WideLanes() {
+    std::vector<BatchLanes const*> lanes = AvailableLanes();
+    lanes.erase(lanes.begin());
+    return lanes;
+}
+
+// An SSE2-only processor has no wide lanes to test.
+GTEST_ALLOW_UNINSTANTIATED_PARAMETERIZED_TEST(WideLanesTest);
+INSTANTIATE_TEST_SUITE_P(EveryWideLaneWidthOfThisProcessor, WideLanesTest,
+                         testing::ValuesIn(WideLanes()),
                          [](testing::TestParamInfo<BatchLanes const*> const& lanes) {
                              return std::string(lanes.param->name);
                          });

@@ -577,6 +577,25 @@ TEST(SimpleImageMap, SetMapSizeGivesAFreshBlankTable) {
     EXPECT_EQ(0u, At(keeper, 1, 1).y);
 }
 
+// The builders' form: a table of the size for the builder to fill, the old one left to its other
+// holders, and the same refusal of a size whose word count is negative.
+TEST(SimpleImageMap, ReserveMapSizeGivesAFreshTableOfTheSizeAndLeavesTheOldOneToItsHolders) {
+    SimpleImageMap map(2, 2);
+    SetAll(map, 7, 8);
+    SimpleImageMap const keeper(map);
+    map.ReserveMapSize(5, 3);
+    EXPECT_NE(keeper.GetMap(), map.GetMap());
+    EXPECT_EQ(5, map.GetMapWidth());
+    EXPECT_EQ(3, map.GetMapHeight());
+    SetAll(map, 1, 2);
+    EXPECT_EQ(7u, At(keeper, 1, 1).x);
+    EXPECT_EQ(8u, At(keeper, 1, 1).y);
+    unsigned short* const table = map.GetMap();
+    EXPECT_THROW(map.ReserveMapSize(40000, 40000), std::bad_alloc);
+    EXPECT_EQ(table, map.GetMap());
+    EXPECT_EQ(5, map.GetMapWidth());
+}
+
 TEST(SimpleImageMap, NegativeWordCountMakesSetMapSizeThrowBadAllocAndKeepsTheOldTable) {
     SimpleImageMap map(2, 3);
     map.image_size = Resolution(100, 50);
