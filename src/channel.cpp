@@ -14,6 +14,7 @@
 #include "vexmap/ptz_position.h"
 #include "vexmap/ptz_range.h"
 #include "vexmap/resolution.h"
+#include "vexmap/view.h"
 #include "vexmap/view_builder.h"
 
 namespace quorvel::vexmap {
@@ -300,6 +301,35 @@ bool Channel::DewarpImage(_DEWARP_IMAGE const& warped, _DEWARP_IMAGE& dewarped) 
         return false;
     }
     view_object->DewarpImage(warped, dewarped);
+    return true;
+}
+
+bool Channel::PrepareImage(_DEWARP_IMAGE_INFO const& dewarped) {
+    WriteLock const lock(*m_pMutex);
+    boost::shared_ptr<AbstractView> const view_object = GetViewObject();
+    View* const view = dynamic_cast<View*>(view_object.get());
+    if (view == nullptr) {
+        Log::err(__LINE__, __FILE__, "PrepareImage", "The view was invalid\n");
+        return false;
+    }
+    view->CheckMap(Resolution(uint32_t(dewarped.width), uint32_t(dewarped.height)));
+    if (!view->GetImageMap()) {
+        Fail(__LINE__, "PrepareImage", EINVAL, "Invalid image map");
+    }
+    return true;
+}
+
+// The current view as it stands: a band must not build one under the read lock that other bands
+// share.
+bool Channel::DewarpImageRows(_DEWARP_IMAGE const& warped, _DEWARP_IMAGE& dewarped,
+                              uint64_t first_row, uint64_t row_count) const {
+    ReadLock const lock(*m_pMutex);
+    View const* const view = dynamic_cast<View const*>(m_pView.get());
+    if (view == nullptr) {
+        Log::err(__LINE__, __FILE__, "DewarpImageRows", "The view was not prepared\n");
+        Fail(__LINE__, "DewarpImageRows", EINVAL, "Image map not prepared");
+    }
+    view->DewarpRows(warped, dewarped, first_row, row_count);
     return true;
 }
 

@@ -320,6 +320,29 @@ int DewarpImage(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewar
     return Result(target->DewarpImage(*warped, *dewarped));
 }
 
+int PrepareImage(void* channel, _DEWARP_IMAGE_INFO const* dewarped) {
+    Channel* const target = Handle(channel, "PrepareImage");
+    if (target == nullptr) {
+        return -1;
+    }
+    Verify(Here("PrepareImage", __LINE__), dewarped, 0, "dewarped image");
+    Verify(Here("PrepareImage", __LINE__), *dewarped);
+    return Result(target->PrepareImage(*dewarped));
+}
+
+int DewarpImageRows(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewarped,
+                    size_t first_row, size_t row_count) {
+    Channel* const target = Handle(channel, "DewarpImageRows");
+    if (target == nullptr) {
+        return -1;
+    }
+    Verify(Here("DewarpImageRows", __LINE__), warped, SizeOf(warped), "warped image");
+    Verify(Here("DewarpImageRows", __LINE__), *warped);
+    Verify(Here("DewarpImageRows", __LINE__), dewarped, SizeOf(dewarped), "dewarped image");
+    Verify(Here("DewarpImageRows", __LINE__), *dewarped);
+    return Result(target->DewarpImageRows(*warped, *dewarped, first_row, row_count));
+}
+
 // The one way a channel ends; a closed handle is not detected and must not come back.
 void Close(void* channel) {
     if (channel == nullptr) {
@@ -433,6 +456,17 @@ int dewarp_calc_ptz_position(void* channel, int x, int y, float zoom,
 
 int dewarp_image(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewarped) {
     return Guarded("dewarp_image", -1, [&] { return DewarpImage(channel, warped, dewarped); });
+}
+
+int dewarp_prepare_image(void* channel, _DEWARP_IMAGE_INFO const* dewarped) {
+    return Guarded("dewarp_prepare_image", -1, [&] { return PrepareImage(channel, dewarped); });
+}
+
+int dewarp_image_rows(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewarped,
+                      size_t first_row, size_t row_count) {
+    return Guarded("dewarp_image_rows", -1, [&] {
+        return DewarpImageRows(channel, warped, dewarped, first_row, row_count);
+    });
 }
 
 // Nothing to answer: a failure is the log line alone.

@@ -145,27 +145,32 @@ size_t SimpleImageMap::TableBytes() const {
 }
 
 void SimpleImageMap::Remap(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination) const {
+    RemapRows(source, destination, ALL_ROWS);
+}
+
+void SimpleImageMap::RemapRows(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                               Rows rows) const {
     switch (uint32_t(source.info.format)) {
         case DEWARP_IMAGE_FORMAT_RGB32_PACKED:
-            RemapRgb32Packed(source, destination);
+            RemapRgb32Packed(source, destination, rows);
             return;
         case DEWARP_IMAGE_FORMAT_YUV422A_PACKED:
-            RemapYuv422aPacked(source, destination);
+            RemapYuv422aPacked(source, destination, rows);
             return;
         case DEWARP_IMAGE_FORMAT_YUV422B_PACKED:
-            RemapYuv422bPacked(source, destination);
+            RemapYuv422bPacked(source, destination, rows);
             return;
         case DEWARP_IMAGE_FORMAT_YUV422_PLANAR:
-            RemapYuv422Planar(source, destination);
+            RemapYuv422Planar(source, destination, rows);
             return;
         case DEWARP_IMAGE_FORMAT_YUV420_PLANAR:
-            RemapYuv420Planar(source, destination);
+            RemapYuv420Planar(source, destination, rows);
             return;
         case DEWARP_IMAGE_FORMAT_YUV411_PLANAR:
-            RemapYuv411Planar(source, destination);
+            RemapYuv411Planar(source, destination, rows);
             return;
         case DEWARP_IMAGE_FORMAT_NV420_PLANAR:
-            RemapNv420Planar(source, destination);
+            RemapNv420Planar(source, destination, rows);
             return;
         default:
             Log::err(__LINE__, __FILE__, "Remap", "Unknown image format %d\n",
@@ -174,11 +179,81 @@ void SimpleImageMap::Remap(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destinati
     }
 }
 
+uint32_t SimpleImageMap::BlockRows(_DEWARP_IMAGE_FORMAT format) {
+    switch (uint32_t(format)) {
+        case DEWARP_IMAGE_FORMAT_RGB32_PACKED:
+            return 1;
+        case DEWARP_IMAGE_FORMAT_YUV411_PLANAR:
+            return 4;
+        case DEWARP_IMAGE_FORMAT_YUV422A_PACKED:
+        case DEWARP_IMAGE_FORMAT_YUV422B_PACKED:
+        case DEWARP_IMAGE_FORMAT_YUV422_PLANAR:
+        case DEWARP_IMAGE_FORMAT_YUV420_PLANAR:
+        case DEWARP_IMAGE_FORMAT_NV420_PLANAR:
+            return 2;
+        default:
+            return 0;
+    }
+}
+
+bool SimpleImageMap::RemapRows(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                               uint64_t first_row, uint64_t row_count) const {
+    uint64_t const block = BlockRows(source.info.format);
+    uint64_t const height = uint32_t(destination.info.height);
+    if (block == 0 || row_count > height || first_row > height - row_count ||
+        first_row % block != 0) {
+        return false;
+    }
+    uint64_t const end = first_row + row_count;
+    if (end % block != 0 && end != height) {
+        return false;
+    }
+    if (row_count > 0) {
+        RemapRows(source, destination, Rows{uint32_t(first_row), uint32_t(end)});
+    }
+    return true;
+}
+
+void SimpleImageMap::RemapRgb32Packed(_DEWARP_IMAGE const& source,
+                                      _DEWARP_IMAGE& destination) const {
+    RemapRgb32Packed(source, destination, ALL_ROWS);
+}
+
+void SimpleImageMap::RemapYuv422aPacked(_DEWARP_IMAGE const& source,
+                                        _DEWARP_IMAGE& destination) const {
+    RemapYuv422aPacked(source, destination, ALL_ROWS);
+}
+
+void SimpleImageMap::RemapYuv422bPacked(_DEWARP_IMAGE const& source,
+                                        _DEWARP_IMAGE& destination) const {
+    RemapYuv422bPacked(source, destination, ALL_ROWS);
+}
+
+void SimpleImageMap::RemapYuv422Planar(_DEWARP_IMAGE const& source,
+                                       _DEWARP_IMAGE& destination) const {
+    RemapYuv422Planar(source, destination, ALL_ROWS);
+}
+
+void SimpleImageMap::RemapYuv420Planar(_DEWARP_IMAGE const& source,
+                                       _DEWARP_IMAGE& destination) const {
+    RemapYuv420Planar(source, destination, ALL_ROWS);
+}
+
+void SimpleImageMap::RemapYuv411Planar(_DEWARP_IMAGE const& source,
+                                       _DEWARP_IMAGE& destination) const {
+    RemapYuv411Planar(source, destination, ALL_ROWS);
+}
+
+void SimpleImageMap::RemapNv420Planar(_DEWARP_IMAGE const& source,
+                                      _DEWARP_IMAGE& destination) const {
+    RemapNv420Planar(source, destination, ALL_ROWS);
+}
+
 // Sizes and bounds compare as signed 32-bit values here: a destination width or height of 2^31 or
 // more writes nothing, a source width of 2^31 or more gives black. Chosen: an index of 2^31 or
 // more is black too, where a signed test would read before the picture.
-void SimpleImageMap::RemapRgb32Packed(_DEWARP_IMAGE const& source,
-                                      _DEWARP_IMAGE& destination) const {
+void SimpleImageMap::RemapRgb32Packed(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                                      Rows band) const {
     Frame const in(source);
     Frame const out(destination);
     int32_t const rows = int32_t(out.height);
@@ -190,7 +265,8 @@ void SimpleImageMap::RemapRgb32Packed(_DEWARP_IMAGE const& source,
     size_t const pitch = 2 * size_t(uint32_t(GetMapWidth()));
     // Copied as words through memcpy: a frame buffer promises no alignment.
     unsigned char const* const pixels = source.data;
-    for (int32_t row = 0; row < rows; ++row) {
+    int32_t const last = int32_t(std::min<int64_t>(rows, int64_t(band.end)));
+    for (int32_t row = int32_t(band.first); row < last; ++row) {
         unsigned short const* entry = map.get() + size_t(uint32_t(row)) * pitch;
         unsigned char* target = destination.data + size_t(uint32_t(row) * out.stride) * 4;
         for (int32_t column = 0; column < columns; ++column, entry += 2, target += 4) {
@@ -207,8 +283,8 @@ void SimpleImageMap::RemapRgb32Packed(_DEWARP_IMAGE const& source,
 
 // In the packed layouts a source pixel's offset is even, and the pair it belongs to starts at
 // that offset less 2 when bit 1 is set: clearing bit 1 does the same without a branch.
-void SimpleImageMap::RemapYuv422aPacked(_DEWARP_IMAGE const& source,
-                                        _DEWARP_IMAGE& destination) const {
+void SimpleImageMap::RemapYuv422aPacked(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                                        Rows band) const {
     Frame const in(source);
     Frame const out(destination);
     uint32_t const block_columns = out.width >> 1;
@@ -220,7 +296,7 @@ void SimpleImageMap::RemapYuv422aPacked(_DEWARP_IMAGE const& source,
     uint32_t const pitch = in.stride * 2;
     size_t const table_pitch = 2 * size_t(uint32_t(GetMapWidth()));
     unsigned char const* const pixels = source.data;
-    for (uint32_t row = 0; row < 2 * block_rows; ++row) {
+    for (uint32_t row = band.first; row < std::min(2 * block_rows, band.end); ++row) {
         unsigned short const* entry = map.get() + size_t(row) * table_pitch;
         unsigned char* target = destination.data + row * (out.stride * 2);
         for (uint32_t pair = 0; pair < block_columns; ++pair, entry += 4, target += 4) {
@@ -241,8 +317,8 @@ void SimpleImageMap::RemapYuv422aPacked(_DEWARP_IMAGE const& source,
     }
 }
 
-void SimpleImageMap::RemapYuv422bPacked(_DEWARP_IMAGE const& source,
-                                        _DEWARP_IMAGE& destination) const {
+void SimpleImageMap::RemapYuv422bPacked(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                                        Rows band) const {
     Frame const in(source);
     Frame const out(destination);
     uint32_t const block_columns = out.width >> 1;
@@ -254,7 +330,7 @@ void SimpleImageMap::RemapYuv422bPacked(_DEWARP_IMAGE const& source,
     uint32_t const pitch = in.stride * 2;
     size_t const table_pitch = 2 * size_t(uint32_t(GetMapWidth()));
     unsigned char const* const pixels = source.data;
-    for (uint32_t row = 0; row < 2 * block_rows; ++row) {
+    for (uint32_t row = band.first; row < std::min(2 * block_rows, band.end); ++row) {
         unsigned short const* entry = map.get() + size_t(row) * table_pitch;
         unsigned char* target = destination.data + row * (out.stride * 2);
         for (uint32_t pair = 0; pair < block_columns; ++pair, entry += 4, target += 4) {
@@ -283,8 +359,8 @@ void SimpleImageMap::RemapYuv422bPacked(_DEWARP_IMAGE const& source,
 // order is free.
 
 // Both rows of a block carry chroma, each from its own entry at the block's left column.
-void SimpleImageMap::RemapYuv422Planar(_DEWARP_IMAGE const& source,
-                                       _DEWARP_IMAGE& destination) const {
+void SimpleImageMap::RemapYuv422Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                                       Rows band) const {
     Frame const in(source);
     Frame const out(destination);
     uint32_t const block_columns = out.width >> 1;
@@ -300,7 +376,8 @@ void SimpleImageMap::RemapYuv422Planar(_DEWARP_IMAGE const& source,
     unsigned char* const u_out = destination.data + out.plane;
     unsigned char* const v_out = u_out + (out.plane >> 1);
     size_t const table_pitch = 2 * size_t(uint32_t(GetMapWidth()));
-    for (uint32_t block_row = 0; block_row < block_rows; ++block_row) {
+    for (uint32_t block_row = band.first / 2; block_row < std::min(block_rows, band.end / 2);
+         ++block_row) {
         uint32_t const row = 2 * block_row;
         unsigned short const* top = map.get() + size_t(row) * table_pitch;
         unsigned short const* bottom = top + table_pitch;
@@ -328,8 +405,8 @@ void SimpleImageMap::RemapYuv422Planar(_DEWARP_IMAGE const& source,
 }
 
 // One chroma look-up for four pixels: the block's top left entry alone decides U and V.
-void SimpleImageMap::RemapYuv420Planar(_DEWARP_IMAGE const& source,
-                                       _DEWARP_IMAGE& destination) const {
+void SimpleImageMap::RemapYuv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                                       Rows band) const {
     Frame const in(source);
     Frame const out(destination);
     uint32_t const block_columns = out.width >> 1;
@@ -346,7 +423,8 @@ void SimpleImageMap::RemapYuv420Planar(_DEWARP_IMAGE const& source,
     unsigned char* const u_out = destination.data + out.plane;
     unsigned char* const v_out = u_out + (out.plane >> 2);
     size_t const table_pitch = 2 * size_t(uint32_t(GetMapWidth()));
-    for (uint32_t block_row = 0; block_row < block_rows; ++block_row) {
+    for (uint32_t block_row = band.first / 2; block_row < std::min(block_rows, band.end / 2);
+         ++block_row) {
         uint32_t const row = 2 * block_row;
         unsigned short const* top = map.get() + size_t(row) * table_pitch;
         unsigned short const* bottom = top + table_pitch;
@@ -366,8 +444,8 @@ void SimpleImageMap::RemapYuv420Planar(_DEWARP_IMAGE const& source,
     }
 }
 
-void SimpleImageMap::RemapYuv411Planar(_DEWARP_IMAGE const& source,
-                                       _DEWARP_IMAGE& destination) const {
+void SimpleImageMap::RemapYuv411Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                                       Rows band) const {
     Frame const in(source);
     Frame const out(destination);
     uint32_t const block_columns = out.width >> 2;
@@ -384,7 +462,8 @@ void SimpleImageMap::RemapYuv411Planar(_DEWARP_IMAGE const& source,
     unsigned char* const u_out = destination.data + out.plane;
     unsigned char* const v_out = u_out + (out.plane >> 4);
     size_t const table_pitch = 2 * size_t(uint32_t(GetMapWidth()));
-    for (uint32_t block_row = 0; block_row < block_rows; ++block_row) {
+    for (uint32_t block_row = band.first / 4; block_row < std::min(block_rows, band.end / 4);
+         ++block_row) {
         uint32_t const row = 4 * block_row;
         unsigned short const* first = map.get() + size_t(row) * table_pitch;
         unsigned short const* second = first + table_pitch;
@@ -418,8 +497,8 @@ void SimpleImageMap::RemapYuv411Planar(_DEWARP_IMAGE const& source,
     }
 }
 
-void SimpleImageMap::RemapNv420Planar(_DEWARP_IMAGE const& source,
-                                      _DEWARP_IMAGE& destination) const {
+void SimpleImageMap::RemapNv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                                      Rows band) const {
     Frame const in(source);
     Frame const out(destination);
     uint32_t const block_columns = out.width >> 1;
@@ -432,7 +511,8 @@ void SimpleImageMap::RemapNv420Planar(_DEWARP_IMAGE const& source,
     unsigned char const* const chroma = source.data + in.plane;
     unsigned char* const chroma_out = destination.data + out.plane;
     size_t const table_pitch = 2 * size_t(uint32_t(GetMapWidth()));
-    for (uint32_t block_row = 0; block_row < block_rows; ++block_row) {
+    for (uint32_t block_row = band.first / 2; block_row < std::min(block_rows, band.end / 2);
+         ++block_row) {
         uint32_t const row = 2 * block_row;
         unsigned short const* top = map.get() + size_t(row) * table_pitch;
         unsigned short const* bottom = top + table_pitch;

@@ -295,6 +295,24 @@ void View::CheckMap(Resolution const& size) {
     }
 }
 
+void View::DewarpRows(_DEWARP_IMAGE const& warped, _DEWARP_IMAGE& dewarped, uint64_t first_row,
+                      uint64_t row_count) const {
+    Resolution const size(uint32_t(dewarped.info.width), uint32_t(dewarped.info.height));
+    if (!image_map || image_map->GetMapSize() != size) {
+        Log::err(__LINE__, __FILE__, "DewarpRows", "The map was not prepared for this size\n");
+        Error::SetLastError(EINVAL);
+        throw Error(CodeLocation("src/view", "View", "DewarpRows", __LINE__), EINVAL,
+                    "Image map not prepared");
+    }
+    if (!image_map->RemapRows(warped, dewarped, first_row, row_count)) {
+        Log::err(__LINE__, __FILE__, "DewarpRows", "Invalid band of %lu rows from row %lu\n",
+                 static_cast<unsigned long>(row_count), static_cast<unsigned long>(first_row));
+        Error::SetLastError(EINVAL);
+        throw Error(CodeLocation("src/view", "View", "DewarpRows", __LINE__), EINVAL,
+                    "Invalid row band");
+    }
+}
+
 Transform2dFunctor::_TRANSFORM_2D View::GetScaleTransform(Resolution const& output) const {
     Transform2dFunctor::_TRANSFORM_2D transform = {};
     float const z = ptz.zoom;

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <cstdint>
+
 #include <boost/shared_ptr.hpp>
 
 #include "vexmap/abstract_view.h"
@@ -48,6 +50,13 @@ public:
     bool GetPtzRange(_DEWARP_PTZ_RANGE& range) const;
     bool CalcPtzPosition(Vector2d const& point, float zoom, _DEWARP_PTZ_POSITION& position) const;
     bool DewarpImage(_DEWARP_IMAGE const& warped, _DEWARP_IMAGE& dewarped) const;
+    /// Builds the current view's map for frames of the size, under the write lock, so that
+    /// DewarpImageRows can then run on several threads at once.
+    bool PrepareImage(_DEWARP_IMAGE_INFO const& dewarped);
+    /// One band of rows of a frame through the current view's map, under the read lock; builds
+    /// nothing and throws EINVAL when the channel was not prepared for the frame's size.
+    bool DewarpImageRows(_DEWARP_IMAGE const& warped, _DEWARP_IMAGE& dewarped, uint64_t first_row,
+                         uint64_t row_count) const;
 
     /// The view of the kind and projection for the camera's mount, from the cache or built and
     /// cached. Const, yet it fills the cache: the frame path may build under the read lock.

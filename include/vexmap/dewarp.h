@@ -9,7 +9,8 @@
    sink of dewarp_set_log and returns -1 (null from the open calls), most with errno set; 0 is
    success. A handle is the channel itself and is checked against null only; it belongs to the
    caller from the open call to dewarp_close. Settings and positions may come from any thread; the
-   frames of one channel come from one thread at a time. Angles are degrees, sizes pixels. */
+   frames of one channel come from one thread at a time, except for the bands of
+   dewarp_image_rows. Angles are degrees, sizes pixels. */
 
 #include "vexmap/dewarp_types.h"
 #include "vexmap/version.h"
@@ -63,6 +64,19 @@ DEWARP_API int dewarp_calc_ptz_position(void* channel, int x, int y, float zoom,
 /* Dewarps one frame into the caller's buffer, at the size and in the layout that `dewarped`
    describes. Both buffers stay the caller's. */
 DEWARP_API int dewarp_image(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewarped);
+
+/* For a host that shares a frame out over its own threads: dewarp_prepare_image builds the table
+   for frames of the size in `dewarped` now, under the channel's write lock, and
+   dewarp_image_rows then dewarps rows first_row to first_row + row_count - 1 of a frame of that
+   size through it, as dewarp_image would write them, building nothing. Any number of threads may
+   run dewarp_image_rows on one prepared channel at once, on bands of one frame or of several. A
+   band starts on a block of the layout and ends on one or at the last row: whole rows for RGB32,
+   pairs for the 4:2:2 and 4:2:0 layouts, fours for 4:1:1. A change of view, position or size
+   drops the table; dewarp_image_rows then fails with EINVAL until the channel is prepared again.
+   Added in version 1.1. */
+DEWARP_API int dewarp_prepare_image(void* channel, _DEWARP_IMAGE_INFO const* dewarped);
+DEWARP_API int dewarp_image_rows(void* channel, _DEWARP_IMAGE const* warped,
+                                 _DEWARP_IMAGE* dewarped, size_t first_row, size_t row_count);
 
 DEWARP_API int dewarp_internal_get_model(void* channel, _DEWARP_INTERNAL_CAMERA_MODEL* model);
 /* A new model puts the camera on the default mount (wall). */

@@ -51,6 +51,9 @@ int GetPtz(void* channel, _DEWARP_PTZ_POSITION* position);
 int GetPtzRange(void* channel, _DEWARP_PTZ_RANGE* range);
 int CalcPtzPosition(void* channel, int x, int y, float zoom, _DEWARP_PTZ_POSITION* position);
 int DewarpImage(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewarped);
+int PrepareImage(void* channel, _DEWARP_IMAGE_INFO const* dewarped);
+int DewarpImageRows(void* channel, _DEWARP_IMAGE const* warped, _DEWARP_IMAGE* dewarped,
+                    size_t first_row, size_t row_count);
 void Close(void* channel);
 int GetModel(void* channel, _DEWARP_INTERNAL_CAMERA_MODEL* model);
 int SetModel(void* channel, _DEWARP_INTERNAL_CAMERA_MODEL const* model);

@@ -51,6 +51,14 @@ public:
     void RemapYuv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination) const;
     void RemapYuv411Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination) const;
     void RemapNv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination) const;
+    /// Output rows first_row to first_row + row_count - 1 only, each as Remap writes it, so that
+    /// threads may share a frame out in bands. A band starts on a block of the layout and ends on
+    /// one or at the last row (BlockRows); false, with nothing written, for one that does not, that
+    /// runs past the destination, or for an unknown format. No rows is a band too.
+    bool RemapRows(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, uint64_t first_row,
+                   uint64_t row_count) const;
+    /// The rows of a layout's block: 1 for RGB32, 4 for 4:1:1, 2 for the others, 0 if unknown.
+    static uint32_t BlockRows(_DEWARP_IMAGE_FORMAT format);
 
     /// The words SetMapSize asks for: the signed 32-bit product width * height * 2, widened.
     static int64_t WordCount(int width, int height);
@@ -60,6 +68,25 @@ public:
     boost::shared_ptr<unsigned short> map;  // null while empty
 
 private:
+    /// Output rows from `first` up to but not including `end`, block-aligned.
+    struct Rows {
+        uint32_t first;
+        uint32_t end;
+    };
+    static constexpr Rows ALL_ROWS = {0, 0xFFFFFFFFu};
+    void RemapRows(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, Rows rows) const;
+    void RemapRgb32Packed(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, Rows rows) const;
+    void RemapYuv422aPacked(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                            Rows rows) const;
+    void RemapYuv422bPacked(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                            Rows rows) const;
+    void RemapYuv422Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                           Rows rows) const;
+    void RemapYuv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                           Rows rows) const;
+    void RemapYuv411Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
+                           Rows rows) const;
+    void RemapNv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, Rows rows) const;
     size_t TableBytes() const;  // what SetMapSize allocated for the present sizes
 };
 

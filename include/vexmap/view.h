@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <vector>
 
 #include <boost/shared_ptr.hpp>
@@ -70,6 +71,12 @@ public:
     void BuildQuarterMap();
     void BuildEighthMap();
     void CheckMap(Resolution const& size);
+    /// Rows first_row to first_row + row_count - 1 of a frame through the map that stands,
+    /// building and changing nothing, so that threads may share a frame out in bands once
+    /// CheckMap has built the map for its size. Throws EINVAL when there is no map of the
+    /// destination's size, or for a band that SimpleImageMap::RemapRows refuses.
+    void DewarpRows(_DEWARP_IMAGE const& warped, _DEWARP_IMAGE& dewarped, uint64_t first_row,
+                    uint64_t row_count) const;
 
     boost::shared_ptr<SimpleImageMap> const& GetImageMap() const { return image_map; }
 

@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "vexmap/channel.h"
+#include "vexmap/error.h"
 #include "vexmap/tarvex_brenvia_418.h"
 
 namespace quorvel::vexmap {
@@ -197,6 +198,70 @@ TEST(Channel, SeveralThreadsRemappingOneChannelAtOnceMakeIdenticalPictures) {
     for (std::size_t t = 0; t < THREADS; ++t) {
         EXPECT_EQ(0, mismatches[t].load()) << "thread " << t;
     }
+}
+
+// A host's own threads share each frame out in bands of rows, all through one prepared channel at
+// once, while another thread moves the view between frames: every band either draws from the
+// map of a whole position or is refused until the channel is prepared again, and a frame whose
+// bands all ran between two moves is the single-threaded frame of that position.
+TEST(Channel, BandsOfOneFrameOnSeveralThreadsWhileTheViewMovesMatchOneThread) {
+    Frame const source(SOURCE_SIZE, SOURCE_SIZE);
+    Channel channel(SmallLens(), DEWARP_INTERNAL_CAMERA_MOUNT_CEILING);
+    channel.SetView(DEWARP_VIEW_SINGLE_PTZ);
+    std::vector<Picture> expected;
+    for (_DEWARP_PTZ_POSITION position : POSITIONS) {
+        channel.SetPtz(position);
+        Frame frame(OUTPUT_WIDTH, OUTPUT_HEIGHT);
+        ASSERT_TRUE(channel.DewarpImage(source.Image(), frame.Image()));
+        expected.push_back(frame.Pixels());
+    }
+
+    constexpr std::size_t BANDS = 4;
+    constexpr std::size_t BAND_ROWS = OUTPUT_HEIGHT / BANDS;
+    int matched = 0;
+    for (int round = 0; round < FRAMES_PER_THREAD; ++round) {
+        std::size_t const at = std::size_t(round) % POSITIONS.size();
+        _DEWARP_PTZ_POSITION position = POSITIONS[at];
+        channel.SetPtz(position);
+        Frame output(OUTPUT_WIDTH, OUTPUT_HEIGHT);
+        std::atomic<int> refused{0};
+        std::atomic<bool> go{false};
+        std::vector<std::thread> bands;
+        for (std::size_t band = 0; band < BANDS; ++band) {
+            bands.emplace_back([&, band]() {
+                while (!go.load()) {
+                    std::this_thread::yield();
+                }
+                try {
+                    channel.DewarpImageRows(source.Image(), output.Image(), band * BAND_ROWS,
+                                            BAND_ROWS);
+                } catch (Error const&) {
+                    ++refused;  // the mover dropped the map before this band ran
+                }
+            });
+        }
+        // Half the rounds move the view while the bands may be running.
+        std::thread mover([&]() {
+            while (!go.load()) {
+                std::this_thread::yield();
+            }
+            if (round % 2 == 1) {
+                _DEWARP_PTZ_POSITION next = POSITIONS[(at + 1) % POSITIONS.size()];
+                channel.SetPtz(next);
+            }
+        });
+        ASSERT_TRUE(channel.PrepareImage(output.Image().info));
+        go = true;
+        for (std::thread& band : bands) {
+            band.join();
+        }
+        mover.join();
+        if (refused.load() == 0 && round % 2 == 0) {
+            EXPECT_EQ(expected[at], output.Pixels()) << "round " << round;
+            ++matched;
+        }
+    }
+    EXPECT_EQ(FRAMES_PER_THREAD / 2, matched);
 }
 
 }  // namespace

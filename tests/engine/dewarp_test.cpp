@@ -1279,3 +1279,90 @@ TEST(Dewarp, ACallerInCGetsTheFrameThatTheSameCallsGiveInCpp) {
 
 }  // namespace
 }  // namespace quorvel::vexmap
+
+namespace {
+
+using namespace quorvel::vexmap;
+
+// The frame in bands of the given rows, each through dewarp_image_rows, after the preparation.
+std::vector<unsigned char> BandedFrame(void* channel, std::size_t band_rows) {
+    Warped warped;
+    Dewarped dewarped;
+    EXPECT_EQ(0, dewarp_prepare_image(channel, &dewarped.Image().info));
+    for (std::size_t first = 0; first < 48; first += band_rows) {
+        EXPECT_EQ(0, dewarp_image_rows(channel, warped.Get(), dewarped.Get(), first,
+                                       std::min<std::size_t>(band_rows, 48 - first)));
+    }
+    EXPECT_TRUE(dewarped.FencesIntact());
+    return dewarped.Pixels();
+}
+
+TEST(DewarpRows, BandsAfterThePreparationMakeTheFrameThatDewarpImageMakes) {
+    for (std::size_t const band_rows : {2u, 6u, 16u, 48u}) {
+        OpenChannel const channel(OpenPtzChannel());
+        EXPECT_EQ(FreshFrame(), BandedFrame(channel.Handle(), band_rows)) << band_rows;
+    }
+}
+
+TEST(DewarpRows, AMovedViewNeedsAnotherPreparationAndThenShowsTheNewPosition) {
+    OpenChannel const channel(OpenPtzChannel());
+    BandedFrame(channel.Handle(), 16);
+    _DEWARP_PTZ_POSITION position = {20.0f, 30.0f, 0.0f, 1.5f};
+    ASSERT_EQ(0, dewarp_set_ptz(channel.Handle(), &position));
+    RecordingLogSink const sink(DEWARP_LOG_LEVEL_ERROR);
+    Warped warped;
+    Dewarped dewarped;
+    errno = 0;
+    EXPECT_EQ(-1, dewarp_image_rows(channel.Handle(), warped.Get(), dewarped.Get(), 0, 48));
+    EXPECT_EQ(EINVAL, errno);
+    ASSERT_FALSE(sink.Lines().empty());
+    EXPECT_EQ(
+        "VEXMAP: ERROR - dewarp_image_rows - (View::DewarpRows@src/view:N) [Error EINVAL (22)] - "
+        "Image map not prepared\n",
+        Texts(sink).back());
+    EXPECT_EQ(std::vector<unsigned char>(dewarped.Pixels().size(), OUTPUT_FILL), dewarped.Pixels());
+    std::vector<unsigned char> const banded = BandedFrame(channel.Handle(), 8);
+    EXPECT_EQ(Frame(channel.Handle()), banded);
+}
+
+TEST(DewarpRows, AChannelNeverPreparedOrPreparedForAnotherSizeRefusesBands) {
+    OpenChannel const channel(OpenPtzChannel());
+    Warped warped;
+    Dewarped dewarped;
+    EXPECT_EQ(-1, dewarp_image_rows(channel.Handle(), warped.Get(), dewarped.Get(), 0, 2));
+    _DEWARP_IMAGE_INFO other = dewarped.Image().info;
+    other.width = 32;
+    ASSERT_EQ(0, dewarp_prepare_image(channel.Handle(), &other));
+    EXPECT_EQ(-1, dewarp_image_rows(channel.Handle(), warped.Get(), dewarped.Get(), 0, 2));
+    EXPECT_EQ(std::vector<unsigned char>(dewarped.Pixels().size(), OUTPUT_FILL), dewarped.Pixels());
+}
+
+TEST(DewarpRows, ABandOffTheBlocksOrPastTheFrameFailsWithEinvalAndWritesNothing) {
+    OpenChannel const channel(OpenPtzChannel());
+    Warped warped;
+    Dewarped dewarped;
+    ASSERT_EQ(0, dewarp_prepare_image(channel.Handle(), &dewarped.Image().info));
+    for (auto const& [first, count] :
+         {std::pair<std::size_t, std::size_t>{1, 2}, {0, 3}, {46, 4}, {50, 0}}) {
+        errno = 0;
+        EXPECT_EQ(-1,
+                  dewarp_image_rows(channel.Handle(), warped.Get(), dewarped.Get(), first, count))
+            << first << " + " << count;
+        EXPECT_EQ(EINVAL, errno);
+    }
+    EXPECT_EQ(std::vector<unsigned char>(dewarped.Pixels().size(), OUTPUT_FILL), dewarped.Pixels());
+    EXPECT_EQ(0, dewarp_image_rows(channel.Handle(), warped.Get(), dewarped.Get(), 10, 0));
+}
+
+TEST(DewarpRows, NullHandlesAndRecordsFailWithoutACrash) {
+    OpenChannel const channel(OpenPtzChannel());
+    Warped warped;
+    Dewarped dewarped;
+    EXPECT_EQ(-1, dewarp_prepare_image(nullptr, &dewarped.Image().info));
+    EXPECT_EQ(-1, dewarp_prepare_image(channel.Handle(), nullptr));
+    EXPECT_EQ(-1, dewarp_image_rows(nullptr, warped.Get(), dewarped.Get(), 0, 2));
+    EXPECT_EQ(-1, dewarp_image_rows(channel.Handle(), nullptr, dewarped.Get(), 0, 2));
+    EXPECT_EQ(-1, dewarp_image_rows(channel.Handle(), warped.Get(), nullptr, 0, 2));
+}
+
+}  // namespace

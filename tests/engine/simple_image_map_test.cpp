@@ -1,5 +1,6 @@
 #include "vexmap/simple_image_map.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <new>
 #include <random>
@@ -1127,6 +1128,96 @@ TEST(SimpleImageMap, ManyThreadsMayRemapThroughOneMapAtOnce) {
     for (Picture const& result : results) {
         EXPECT_TRUE(SameBytes(expected.bytes, result.bytes));
     }
+}
+
+}  // namespace
+}  // namespace quorvel::vexmap
+
+namespace quorvel::vexmap {
+namespace {
+
+// A map of scattered source positions over a 40 x 31 source, some outside, for the band tests.
+SimpleImageMap ScatteredMap(int width, int height) {
+    SimpleImageMap map(width, height);
+    std::mt19937 random(17);
+    std::uniform_int_distribution<int> x(0, 44);
+    std::uniform_int_distribution<int> y(0, 34);
+    for (uint32_t row = 0; row < uint32_t(height); ++row) {
+        for (uint32_t column = 0; column < uint32_t(width); ++column) {
+            Set(map, column, row, static_cast<unsigned short>(x(random)),
+                static_cast<unsigned short>(y(random)));
+        }
+    }
+    return map;
+}
+
+// Bands of every block-aligned split, in any order, give the frame that one Remap gives.
+TEST(SimpleImageMapRows, BandsInAnyOrderMakeTheWholeFrameInEveryLayout) {
+    for (_DEWARP_IMAGE_FORMAT const format : ALL_FORMATS) {
+        for (int const height : {24, 27}) {
+            SimpleImageMap const map = ScatteredMap(20, height);
+            Picture const source = Numbered(format, 40, 31, 44);
+            Picture whole(format, 20, size_t(height), 22);
+            map.Remap(source.image, whole.image);
+            uint32_t const block = SimpleImageMap::BlockRows(format);
+            for (uint32_t const band : {block, 2 * block, 3 * block, 8u}) {
+                uint32_t const rows = band - band % block;
+                Picture banded(format, 20, size_t(height), 22);
+                std::vector<uint64_t> firsts;
+                for (uint64_t first = 0; first < uint64_t(height); first += rows) {
+                    firsts.push_back(first);
+                }
+                std::reverse(firsts.begin(), firsts.end());
+                for (uint64_t const first : firsts) {
+                    uint64_t const count = std::min<uint64_t>(rows, uint64_t(height) - first);
+                    ASSERT_TRUE(map.RemapRows(source.image, banded.image, first, count))
+                        << NameOf(format) << " rows " << first << " + " << count;
+                }
+                EXPECT_EQ(whole.bytes, banded.bytes)
+                    << NameOf(format) << ", height " << height << ", bands of " << rows;
+            }
+        }
+    }
+}
+
+// A band writes its own rows and nothing else: a band and the rest around it touch different
+// bytes, and together they are the frame.
+TEST(SimpleImageMapRows, ABandLeavesTheOtherRowsAsTheyWere) {
+    for (_DEWARP_IMAGE_FORMAT const format : ALL_FORMATS) {
+        SimpleImageMap const map = ScatteredMap(20, 24);
+        Picture const source = Numbered(format, 40, 31, 44);
+        Picture whole(format, 20, 24, 22);
+        map.Remap(source.image, whole.image);
+        Picture band(format, 20, 24, 22);
+        ASSERT_TRUE(map.RemapRows(source.image, band.image, 8, 8));
+        Picture rest(format, 20, 24, 22);
+        ASSERT_TRUE(map.RemapRows(source.image, rest.image, 0, 8));
+        ASSERT_TRUE(map.RemapRows(source.image, rest.image, 16, 8));
+        for (size_t i = 0; i < whole.bytes.size(); ++i) {
+            ASSERT_TRUE(band.bytes[i] == MARKER || rest.bytes[i] == MARKER)
+                << NameOf(format) << " byte " << i << " written by both";
+            unsigned char const together = band.bytes[i] != MARKER ? band.bytes[i] : rest.bytes[i];
+            ASSERT_EQ(whole.bytes[i], together) << NameOf(format) << " byte " << i;
+        }
+    }
+}
+
+TEST(SimpleImageMapRows, ABandOffTheBlocksOrPastTheEndIsRefusedAndWritesNothing) {
+    SimpleImageMap const map = ScatteredMap(20, 27);
+    Picture const source = Numbered(DEWARP_IMAGE_FORMAT_YUV411_PLANAR, 40, 31, 44);
+    Picture target(DEWARP_IMAGE_FORMAT_YUV411_PLANAR, 20, 27, 22);
+    std::vector<unsigned char> const before = target.bytes;
+    EXPECT_FALSE(map.RemapRows(source.image, target.image, 2, 4));   // starts inside a block
+    EXPECT_FALSE(map.RemapRows(source.image, target.image, 4, 6));   // ends inside a block
+    EXPECT_FALSE(map.RemapRows(source.image, target.image, 24, 4));  // runs past row 27
+    EXPECT_FALSE(map.RemapRows(source.image, target.image, 28, 0));  // starts past the end
+    EXPECT_FALSE(map.RemapRows(source.image, target.image, 0, ~uint64_t(0)));
+    _DEWARP_IMAGE unknown = source.image;
+    unknown.info.format = static_cast<_DEWARP_IMAGE_FORMAT>(7);
+    EXPECT_FALSE(map.RemapRows(unknown, target.image, 0, 4));
+    EXPECT_EQ(before, target.bytes);
+    EXPECT_TRUE(map.RemapRows(source.image, target.image, 24, 3));  // the last rows, to the end
+    EXPECT_TRUE(map.RemapRows(source.image, target.image, 8, 0));   // no rows: nothing to do
 }
 
 }  // namespace
