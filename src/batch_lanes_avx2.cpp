@@ -13,6 +13,7 @@ struct Avx2Lane {
     static constexpr int WIDTH = 8;
     // The library's code and ours use only the sixteen registers that vzeroupper clears.
     static void Leave() { _mm256_zeroupper(); }
+    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const&) { return 0; }
     static Pack Load(float const* p) { return _mm256_loadu_ps(p); }
     static void Store(float* p, Pack v) { _mm256_storeu_ps(p, v); }
     static Pack Fill(float v) { return _mm256_set1_ps(v); }

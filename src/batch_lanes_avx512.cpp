@@ -28,6 +28,67 @@ struct Avx512Lane {
                 : "xmm16", "xmm17", "xmm18", "xmm19", "xmm20", "xmm21", "xmm22", "xmm23", "xmm24",
                   "xmm25", "xmm26", "xmm27", "xmm28", "xmm29", "xmm30", "xmm31");
     }
+    // Sixteen luma samples of one table row: the low byte of the dword at each index, 16 where
+    // the plain test fails. The dword reaches three bytes past the sample, into the chroma planes.
+    static __m128i LumaSixteen(__m512i entries, BatchLanes::Yuv420Row const& row) {
+        __m512i const x = _mm512_and_si512(entries, _mm512_set1_epi32(0xFFFF));
+        __m512i const y = _mm512_srli_epi32(entries, 16);
+        __m512i const index =
+            _mm512_add_epi32(_mm512_mullo_epi32(y, _mm512_set1_epi32(int(row.stride))), x);
+        __mmask16 const inside =
+            _kand_mask16(_mm512_cmplt_epu32_mask(index, _mm512_set1_epi32(int(row.plane))),
+                         _mm512_cmplt_epu32_mask(x, _mm512_set1_epi32(int(row.width))));
+        __m512i const samples =
+            _mm512_mask_i32gather_epi32(_mm512_set1_epi32(16), inside, index, row.luma, 1);
+        return _mm512_cvtepi32_epi8(samples);
+    }
+    // Sixteen chroma samples from one plane: the dword that ends at each sample, so that nothing
+    // past the frame's last plane is read; its top byte, or 128 where the plain test fails.
+    static __m128i ChromaSixteen(__m512i index, __mmask16 inside, unsigned char const* plane) {
+        __m512i const samples =
+            _mm512_mask_i32gather_epi32(_mm512_set1_epi32(128 << 24), inside, index, plane - 3, 1);
+        return _mm512_cvtepi32_epi8(_mm512_srli_epi32(samples, 24));
+    }
+    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const& row) {
+        if (row.plane < 64 || row.plane >= 0x80000000u) {
+            return 0;
+        }
+        // The table entry of each block's top left pixel: the even entries of the top row.
+        __m512i const even =
+            _mm512_setr_epi32(0, 2, 4, 6, 8, 10, 12, 14, 16, 18, 20, 22, 24, 26, 28, 30);
+        uint32_t const chroma_limit = row.plane >> 2;
+        uint32_t done = 0;
+        for (; done + 16 <= row.blocks; done += 16) {
+            __m512i const top_left = _mm512_loadu_si512(row.top + 4 * done);
+            __m512i const top_right = _mm512_loadu_si512(row.top + 4 * done + 32);
+            __m512i const bottom_left = _mm512_loadu_si512(row.bottom + 4 * done);
+            __m512i const bottom_right = _mm512_loadu_si512(row.bottom + 4 * done + 32);
+            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.top_out + 2 * done),
+                             LumaSixteen(top_left, row));
+            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.top_out + 2 * done + 16),
+                             LumaSixteen(top_right, row));
+            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.bottom_out + 2 * done),
+                             LumaSixteen(bottom_left, row));
+            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.bottom_out + 2 * done + 16),
+                             LumaSixteen(bottom_right, row));
+            __m512i const corners = _mm512_permutex2var_epi32(top_left, even, top_right);
+            __m512i const x = _mm512_and_si512(corners, _mm512_set1_epi32(0xFFFF));
+            __m512i const y = _mm512_srli_epi32(corners, 16);
+            __m512i const index =
+                _mm512_add_epi32(_mm512_srli_epi32(x, 1),
+                                 _mm512_mullo_epi32(_mm512_srli_epi32(y, 1),
+                                                    _mm512_set1_epi32(int(row.chroma_stride))));
+            __mmask16 const inside =
+                _kand_mask16(_mm512_cmplt_epu32_mask(index, _mm512_set1_epi32(int(chroma_limit))),
+                             _mm512_cmplt_epu32_mask(x, _mm512_set1_epi32(int(row.width))));
+            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.u_out + done),
+                             ChromaSixteen(index, inside, row.u_plane));
+            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.v_out + done),
+                             ChromaSixteen(index, inside, row.v_plane));
+        }
+        Leave();
+        return done;
+    }
     static Pack Load(float const* p) { return _mm512_loadu_ps(p); }
     static void Store(float* p, Pack v) { _mm512_storeu_ps(p, v); }
     static Pack Fill(float v) { return _mm512_set1_ps(v); }

@@ -7,6 +7,7 @@
 
 #include <boost/core/checked_delete.hpp>
 
+#include "vexmap/batch_lanes.h"
 #include "vexmap/log.h"
 
 namespace quorvel::vexmap {
@@ -164,7 +165,7 @@ void SimpleImageMap::RemapRows(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& desti
             RemapYuv422Planar(source, destination, rows);
             return;
         case DEWARP_IMAGE_FORMAT_YUV420_PLANAR:
-            RemapYuv420Planar(source, destination, rows);
+            RemapYuv420Planar(source, destination, rows, BatchLanes::Widest());
             return;
         case DEWARP_IMAGE_FORMAT_YUV411_PLANAR:
             RemapYuv411Planar(source, destination, rows);
@@ -236,7 +237,16 @@ void SimpleImageMap::RemapYuv422Planar(_DEWARP_IMAGE const& source,
 
 void SimpleImageMap::RemapYuv420Planar(_DEWARP_IMAGE const& source,
                                        _DEWARP_IMAGE& destination) const {
-    RemapYuv420Planar(source, destination, ALL_ROWS);
+    RemapYuv420Planar(source, destination, ALL_ROWS, BatchLanes::Widest());
+}
+
+void SimpleImageMap::RemapWithLanes(BatchLanes const& lanes, _DEWARP_IMAGE const& source,
+                                    _DEWARP_IMAGE& destination) const {
+    if (source.info.format == DEWARP_IMAGE_FORMAT_YUV420_PLANAR) {
+        RemapYuv420Planar(source, destination, ALL_ROWS, lanes);
+    } else {
+        Remap(source, destination);
+    }
 }
 
 void SimpleImageMap::RemapYuv411Planar(_DEWARP_IMAGE const& source,
@@ -406,7 +416,7 @@ void SimpleImageMap::RemapYuv422Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAG
 
 // One chroma look-up for four pixels: the block's top left entry alone decides U and V.
 void SimpleImageMap::RemapYuv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
-                                       Rows band) const {
+                                       Rows band, BatchLanes const& lanes) const {
     Frame const in(source);
     Frame const out(destination);
     uint32_t const block_columns = out.width >> 1;
@@ -432,7 +442,14 @@ void SimpleImageMap::RemapYuv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAG
         unsigned char* bottom_out = top_out + out.stride;
         unsigned char* const u_target = u_out + block_row * out_chroma_stride;
         unsigned char* const v_target = v_out + block_row * out_chroma_stride;
-        for (uint32_t column = 0; column < block_columns;
+        uint32_t const done = lanes.remap_yuv420_blocks(BatchLanes::Yuv420Row{
+            top, bottom, block_columns, luma, u_plane, v_plane, in.width, in.stride, in.plane,
+            chroma_stride, top_out, bottom_out, u_target, v_target});
+        top += 4 * done;
+        bottom += 4 * done;
+        top_out += 2 * done;
+        bottom_out += 2 * done;
+        for (uint32_t column = done; column < block_columns;
              ++column, top += 4, bottom += 4, top_out += 2, bottom_out += 2) {
             LumaBlock(luma, in, top, bottom, top_out, bottom_out);
             uint32_t const x = top[0];

@@ -16,6 +16,8 @@
 #endif
 
 #include "bench_views.h"
+#include "in_turns.h"
+#include "vexmap/batch_lanes.h"
 
 namespace quorvel::vexmap {
 namespace {
@@ -110,6 +112,25 @@ void BM_SimpleImageMap_RemapYuv420Planar(benchmark::State& state) {
     RunRemap(state, DEWARP_IMAGE_FORMAT_YUV420_PLANAR);
 }
 BENCHMARK(BM_SimpleImageMap_RemapYuv420Planar);
+
+// The plain path alone, and the widest vector path against it in turns: `vector_speedup` is the
+// plain frame's time over the vector one's.
+void BM_SimpleImageMap_RemapYuv420PlanarPlainAndVector(benchmark::State& state) {
+    SimpleImageMap const& map = BenchMap();
+    BenchFrame const source(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, SOURCE_SIDE, SOURCE_SIDE);
+    BenchFrame destination(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, OUTPUT_WIDTH, OUTPUT_HEIGHT);
+    for (auto _ : state) {
+        map.RemapWithLanes(BatchLanes::Sse2(), source.image, destination.image);
+        benchmark::DoNotOptimize(destination.bytes.data());
+        benchmark::ClobberMemory();
+    }
+    SetProcessed(state, destination.bytes.size());
+    bench::Turns const turns = bench::InTurns(
+        20, [&] { map.RemapWithLanes(BatchLanes::Sse2(), source.image, destination.image); },
+        [&] { map.RemapWithLanes(BatchLanes::Widest(), source.image, destination.image); });
+    state.counters["vector_speedup"] = turns.Ratio();
+}
+BENCHMARK(BM_SimpleImageMap_RemapYuv420PlanarPlainAndVector);
 
 void BM_SimpleImageMap_RemapYuv411Planar(benchmark::State& state) {
     RunRemap(state, DEWARP_IMAGE_FORMAT_YUV411_PLANAR);

@@ -396,7 +396,8 @@ constexpr BatchLanes Table(char const* name, bool (*supported)()) {
          &C::CylindricalToFisheyeEntry, &C::EquirectangularToFisheyeEntry,
          &C::MercatorToEquirectangularEntry, &C::LambertToEquirectangularEntry,
          &C::MillerToEquirectangularEntry, &C::ArchitecturalToEquirectangularEntry,
-         &C::PanniniToEquirectangularEntry, &C::EquirectangularPanniniToEquirectangularEntry}};
+         &C::PanniniToEquirectangularEntry, &C::EquirectangularPanniniToEquirectangularEntry},
+        &L::RemapYuv420Blocks};
 }
 
 }  // namespace quorvel::vexmap::lane_kernels

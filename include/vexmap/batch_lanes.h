@@ -1,5 +1,7 @@
 #pragma once
 
+#include <cstdint>
+
 namespace quorvel::vexmap {
 
 /// One width of vector lanes for `BatchTrigonometry`: the same operations, each over an array of
@@ -7,6 +9,26 @@ namespace quorvel::vexmap {
 /// wider tables are compiled for their instructions alone and may be called only where the
 /// processor has them (`Supported`). Plain data; any thread.
 struct BatchLanes {
+    /// One block row of SimpleImageMap::RemapYuv420Planar: the table rows of its two output rows,
+    /// the source planes and the Frame numbers of its test (all 32-bit, as the plain path has
+    /// them), and where the block row's luma rows and chroma samples go.
+    struct Yuv420Row {
+        unsigned short const* top;
+        unsigned short const* bottom;
+        uint32_t blocks;
+        unsigned char const* luma;
+        unsigned char const* u_plane;
+        unsigned char const* v_plane;
+        uint32_t width;
+        uint32_t stride;
+        uint32_t plane;  // luma bytes, height * stride; each chroma plane is a quarter
+        uint32_t chroma_stride;
+        unsigned char* top_out;
+        unsigned char* bottom_out;
+        unsigned char* u_out;
+        unsigned char* v_out;
+    };
+
     /// Below NEAR_LIMIT in magnitude, adding and taking away ROUNDER rounds a float to the nearest
     /// integer, ties to even, as nearbyint does in the default rounding mode, with no call.
     static constexpr float NEAR_LIMIT = 4194304.0f;
@@ -53,6 +75,12 @@ struct BatchLanes {
     int (*store_eighth_spans)(unsigned short* cursor, float const* x, float const* y, int count,
                               float cx, float cy);
     ChainKernel chain[CHAIN_KIND_COUNT];
+    /// Blocks of a Yuv420Row from the first on, as many as the lanes take at once, written as the
+    /// plain path writes them; returns how many, and the plain loop finishes the row. It reads up
+    /// to three bytes beyond a luma sample and before a chroma sample, inside the frame, so it
+    /// takes a row only when the plane holds at least 64 bytes and less than 2^31. The narrower
+    /// tables do none.
+    uint32_t (*remap_yuv420_blocks)(Yuv420Row const& row);
 
     static BatchLanes const& Sse2();
     static BatchLanes const& Avx2();

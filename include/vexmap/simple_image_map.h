@@ -10,6 +10,8 @@
 
 namespace quorvel::vexmap {
 
+struct BatchLanes;
+
 /// The look-up table that turns a warped frame into a dewarped one: per output pixel two 16-bit
 /// words, source x then source y, rows one after the other; (65535, 65535) marks an entry that
 /// no builder wrote. Copies share the table; SetMapSize gives this object a fresh one. Remap
@@ -57,6 +59,11 @@ public:
     /// runs past the destination, or for an unknown format. No rows is a band too.
     bool RemapRows(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, uint64_t first_row,
                    uint64_t row_count) const;
+    /// Remap through the vector kernels of the given lanes, the plain loop finishing each row,
+    /// where Remap takes the widest lanes of the processor: the narrowest table runs the plain
+    /// path alone, so that tests can hold each width to it.
+    void RemapWithLanes(BatchLanes const& lanes, _DEWARP_IMAGE const& source,
+                        _DEWARP_IMAGE& destination) const;
     /// The rows of a layout's block: 1 for RGB32, 4 for 4:1:1, 2 for the others, 0 if unknown.
     static uint32_t BlockRows(_DEWARP_IMAGE_FORMAT format);
 
@@ -82,8 +89,8 @@ private:
                             Rows rows) const;
     void RemapYuv422Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
                            Rows rows) const;
-    void RemapYuv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
-                           Rows rows) const;
+    void RemapYuv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, Rows rows,
+                           BatchLanes const& lanes) const;
     void RemapYuv411Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
                            Rows rows) const;
     void RemapNv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, Rows rows) const;

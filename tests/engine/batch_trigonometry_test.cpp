@@ -228,6 +228,13 @@ TEST_P(WideLanesTest, EveryFunctionLeavesTheWideRegistersClean) {
         lanes.chain[kind](parameters, x.data(), y.data(), 40, work.data());
         expect_clean("a chain kernel");
     }
+    std::vector<unsigned short> const table(4 * 32, 3);
+    std::vector<unsigned char> const frame(96 * 3 / 2, 9);
+    std::vector<unsigned char> picture(64 * 3);
+    lanes.remap_yuv420_blocks(BatchLanes::Yuv420Row{
+        table.data(), table.data() + 64, 16, frame.data(), frame.data() + 64, frame.data() + 80, 8,
+        8, 64, 4, picture.data(), picture.data() + 32, picture.data() + 64, picture.data() + 96});
+    expect_clean("remap_yuv420_blocks");
 }
 
 INSTANTIATE_TEST_SUITE_P(EveryLaneWidthOfThisProcessor, BatchLanesTest,

@@ -12,6 +12,7 @@
 #include <gtest/gtest.h>
 
 #include "recording_log_sink.h"
+#include "vexmap/batch_lanes.h"
 
 namespace quorvel::vexmap {
 namespace {
@@ -1219,6 +1220,85 @@ TEST(SimpleImageMapRows, ABandOffTheBlocksOrPastTheEndIsRefusedAndWritesNothing)
     EXPECT_TRUE(map.RemapRows(source.image, target.image, 24, 3));  // the last rows, to the end
     EXPECT_TRUE(map.RemapRows(source.image, target.image, 8, 0));   // no rows: nothing to do
 }
+
+}  // namespace
+}  // namespace quorvel::vexmap
+
+namespace quorvel::vexmap {
+namespace {
+
+std::vector<BatchLanes const*> AvailableLanes() {
+    std::vector<BatchLanes const*> lanes = {&BatchLanes::Sse2()};
+    for (BatchLanes const* wide : {&BatchLanes::Avx2(), &BatchLanes::Avx512()}) {
+        if (wide->Supported()) {
+            lanes.push_back(wide);
+        }
+    }
+    return lanes;
+}
+
+class SimpleImageMapLanesTest : public testing::TestWithParam<BatchLanes const*> {};
+
+// Random tables (inside, on the edges, past them, unmapped) over random sizes and strides: every
+// lane width writes the frame that the plain path writes, byte for byte, and nothing else.
+TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathByteForByte) {
+    std::mt19937 random(23);
+    for (int round = 0; round < 60; ++round) {
+        std::uniform_int_distribution<int> side(1, 90);
+        uint32_t const source_width = uint32_t(side(random)) + 1;
+        uint32_t const source_height = uint32_t(side(random)) + 1;
+        uint32_t const source_stride = source_width + uint32_t(round % 3) * 5;
+        int const width = 2 * side(random) + round % 2;
+        int const height = 2 * (side(random) / 3) + round % 2;
+        SimpleImageMap map(width, height);
+        std::uniform_int_distribution<int> x(0, int(source_width) + 3);
+        std::uniform_int_distribution<int> y(0, int(source_height) + 3);
+        std::uniform_int_distribution<int> oddity(0, 19);
+        for (uint32_t row = 0; row < uint32_t(height); ++row) {
+            for (uint32_t column = 0; column < uint32_t(width); ++column) {
+                int const odd = oddity(random);
+                unsigned short const ex =
+                    odd == 0 ? UNMAPPED : static_cast<unsigned short>(x(random));
+                unsigned short const ey = odd == 1 ? 65000 : static_cast<unsigned short>(y(random));
+                Set(map, column, row, ex, ey);
+            }
+        }
+        Picture const source =
+            Numbered(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, source_width, source_height, source_stride);
+        Picture plain(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, size_t(width), size_t(height),
+                      size_t(width) + 3);
+        Picture lanes(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, size_t(width), size_t(height),
+                      size_t(width) + 3);
+        map.RemapWithLanes(BatchLanes::Sse2(), source.image, plain.image);
+        map.RemapWithLanes(*GetParam(), source.image, lanes.image);
+        ASSERT_EQ(plain.bytes, lanes.bytes)
+            << "round " << round << ": " << width << "x" << height << " from " << source_width
+            << "x" << source_height << " stride " << source_stride;
+    }
+}
+
+// The 1080p frame of a real view from a 2880 fisheye, where the wide lanes do nearly all of it.
+TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathForALargeView) {
+    SimpleImageMap map(1920, 1080);
+    for (uint32_t row = 0; row < 1080; ++row) {
+        for (uint32_t column = 0; column < 1920; ++column) {
+            Set(map, column, row, static_cast<unsigned short>(column * 3 / 2 + row / 7),
+                static_cast<unsigned short>(row * 2 + column / 11));
+        }
+    }
+    Picture const source = Numbered(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, 2880, 2880, 2880);
+    Picture plain(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, 1920, 1080, 1920);
+    Picture lanes(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, 1920, 1080, 1920);
+    map.RemapWithLanes(BatchLanes::Sse2(), source.image, plain.image);
+    map.RemapWithLanes(*GetParam(), source.image, lanes.image);
+    EXPECT_TRUE(plain.bytes == lanes.bytes);
+}
+
+INSTANTIATE_TEST_SUITE_P(EveryLaneWidthOfThisProcessor, SimpleImageMapLanesTest,
+                         testing::ValuesIn(AvailableLanes()),
+                         [](testing::TestParamInfo<BatchLanes const*> const& lanes) {
+                             return std::string(lanes.param->name);
+                         });
 
 }  // namespace
 }  // namespace quorvel::vexmap
