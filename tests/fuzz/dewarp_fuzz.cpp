@@ -169,7 +169,7 @@ void* Open(FuzzedDataProvider& input) {
 void Call(FuzzedDataProvider& input, void* channel) {
     // A record pointer is null now and then, to take the pointer checks.
     bool const null_record = input.ConsumeIntegralInRange(0, 15) == 0;
-    switch (input.ConsumeIntegralInRange(0, 16)) {
+    switch (input.ConsumeIntegralInRange(0, 18)) {
         case 0:
             dewarp_set_view(channel, Pick<_DEWARP_VIEW>(input, 4));
             break;
@@ -247,6 +247,39 @@ void Call(FuzzedDataProvider& input, void* channel) {
         case 15:
             dewarp_internal_set_mount(channel, Pick<_DEWARP_INTERNAL_CAMERA_MOUNT>(input, 4));
             break;
+        case 16: {
+            _DEWARP_IMAGE_FORMAT const format = Pick<_DEWARP_IMAGE_FORMAT>(input, 7);
+            Frame dewarped(input, format, format);
+            // A size is prepared only as large as a frame the fuzzer would give pixels: a table
+            // of any size asked for is built, as the caller wants it.
+            if (null_record || dewarped.Get()->data != nullptr) {
+                dewarp_prepare_image(channel, null_record ? nullptr : &dewarped.Get()->info);
+            }
+            break;
+        }
+        case 17: {
+            // Mostly prepared for the frame's own size, then bands: mostly whole blocks inside
+            // the frame, sometimes anything.
+            _DEWARP_IMAGE_FORMAT const format = Pick<_DEWARP_IMAGE_FORMAT>(input, 7);
+            Frame warped(input, format, format);
+            Frame dewarped(input, format, format);
+            if (dewarped.Get()->data != nullptr && input.ConsumeIntegralInRange(0, 7) != 0) {
+                dewarp_prepare_image(channel, &dewarped.Get()->info);
+            }
+            std::size_t const height = dewarped.Get()->info.height;
+            for (int band = input.ConsumeIntegralInRange(1, 4); band > 0; --band) {
+                bool const anything = input.ConsumeIntegralInRange(0, 7) == 0;
+                std::size_t const first =
+                    anything ? input.ConsumeIntegral<std::size_t>()
+                             : 4 * input.ConsumeIntegralInRange<std::size_t>(0, height / 4);
+                std::size_t const count =
+                    anything ? input.ConsumeIntegral<std::size_t>()
+                             : 4 * input.ConsumeIntegralInRange<std::size_t>(0, height / 4);
+                dewarp_image_rows(channel, null_record ? nullptr : warped.Get(), dewarped.Get(),
+                                  first, count);
+            }
+            break;
+        }
         default:
             dewarp_channel_valid(channel);
             break;
