@@ -38,6 +38,7 @@ struct Sse2Lane {
     }
     static Pack Sin(Pack v) { return Sleef_sinf4_u10(v); }
     static Pack Cos(Pack v) { return Sleef_cosf4_u10(v); }
+    static auto SinCos(Pack v) { return Sleef_sincosf4_u10(v); }
     static Pack Tan(Pack v) { return Sleef_tanf4_u10(v); }
     static Pack Atan(Pack v) { return Sleef_atanf4_u10(v); }
     static Pack Atan2(Pack y, Pack x) { return Sleef_atan2f4_u10(y, x); }

@@ -39,6 +39,7 @@ struct Avx2Lane {
     }
     static Pack Sin(Pack v) { return Sleef_sinf8_u10avx2(v); }
     static Pack Cos(Pack v) { return Sleef_cosf8_u10avx2(v); }
+    static auto SinCos(Pack v) { return Sleef_sincosf8_u10avx2(v); }
     static Pack Tan(Pack v) { return Sleef_tanf8_u10avx2(v); }
     static Pack Atan(Pack v) { return Sleef_atanf8_u10avx2(v); }
     static Pack Atan2(Pack y, Pack x) { return Sleef_atan2f8_u10avx2(y, x); }

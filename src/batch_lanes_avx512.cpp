@@ -132,6 +132,7 @@ struct Avx512Lane {
     }
     static Pack Sin(Pack v) { return Sleef_sinf16_u10avx512f(v); }
     static Pack Cos(Pack v) { return Sleef_cosf16_u10avx512f(v); }
+    static auto SinCos(Pack v) { return Sleef_sincosf16_u10avx512f(v); }
     static Pack Tan(Pack v) { return Sleef_tanf16_u10avx512f(v); }
     static Pack Atan(Pack v) { return Sleef_atanf16_u10avx512f(v); }
     static Pack Atan2(Pack y, Pack x) { return Sleef_atan2f16_u10avx512f(y, x); }

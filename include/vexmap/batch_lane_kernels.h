@@ -67,6 +67,31 @@ struct Kernels {
         ApplyUnary<L>(x, out, count, [](auto v) { return L::Cos(v); });
         L::Leave();
     }
+    // Sine and cosine of the same angles in one call; `cosine` may be the input.
+    static void SinCos(float const* x, float* sine, float* cosine, int count) {
+        int i = 0;
+        for (; i + L::WIDTH <= count; i += L::WIDTH) {
+            auto const both = L::SinCos(L::Load(x + i));
+            L::Store(sine + i, both.x);
+            L::Store(cosine + i, both.y);
+        }
+        if (i < count) {
+            float in_tail[L::WIDTH] = {};
+            float sine_tail[L::WIDTH];
+            float cosine_tail[L::WIDTH];
+            for (int k = 0; i + k < count; ++k) {
+                in_tail[k] = x[i + k];
+            }
+            auto const both = L::SinCos(L::Load(in_tail));
+            L::Store(sine_tail, both.x);
+            L::Store(cosine_tail, both.y);
+            for (int k = 0; i + k < count; ++k) {
+                sine[i + k] = sine_tail[k];
+                cosine[i + k] = cosine_tail[k];
+            }
+        }
+        L::Leave();
+    }
     static void Tan(float const* x, float* out, int count) {
         ApplyUnary<L>(x, out, count, [](auto v) { return L::Tan(v); });
         L::Leave();
@@ -151,8 +176,7 @@ struct Chain {
         for (int i = 0; i < count; ++i) {
             c[i] = r[i] / f;
         }
-        K::Sin(c, s, count);
-        K::Cos(c, c, count);
+        K::SinCos(c, s, c, count);
         for (int i = 0; i < count; ++i) {
             float const ratio = s[i] / r[i];
             float const k = r[i] == 0.0f ? 0.0f : ratio;
@@ -197,8 +221,7 @@ struct Chain {
         for (int i = 0; i < count; ++i) {
             h[i] = x[i] / f;
         }
-        K::Sin(h, a, count);
-        K::Cos(h, c, count);
+        K::SinCos(h, a, c, count);
         for (int i = 0; i < count; ++i) {
             a[i] = f * a[i];
             c[i] = f * c[i];
@@ -228,10 +251,8 @@ struct Chain {
             x[i] = over_south ? turned + PI : turned;
             y[i] = over_south ? PI - (reflected - PI) : reflected;
         }
-        K::Sin(y, sin_a, count);
-        K::Cos(y, cos_a, count);
-        K::Sin(x, sin_l, count);
-        K::Cos(x, cos_l, count);
+        K::SinCos(y, sin_a, cos_a, count);
+        K::SinCos(x, sin_l, cos_l, count);
         // sin_l becomes vx, cos_l vz, and cos_a is vy.
         for (int i = 0; i < count; ++i) {
             sin_l[i] = sin_l[i] * sin_a[i];
