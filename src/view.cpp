@@ -428,7 +428,7 @@ void View::BuildShiftedMap(Vector2d const& scale_crop, Vector2d const& area_size
         }
         batch.Run(xs.data(), ys.data(), points);
         int const row = static_cast<int>(float(y) + walk.origin.y);
-        StartRow(walk, row);
+        StartRow(walk, row, column, column + 1 + spans * step);
         unsigned short* cursor = EntryAt(*walk.map, column, row);
         StoreRow(cursor, xs.data(), ys.data(), points, walk.centre, step);
     }
@@ -457,13 +457,23 @@ View::MapWalk View::StartMapWalk(Vector2d const& area_size) const {
 }
 
 void View::StartRow(MapWalk& walk, int row) {
+    StartRow(walk, row, 0, 0);
+}
+
+// Only the entries outside [first, end) are filled: the builder writes those inside.
+void View::StartRow(MapWalk& walk, int row, int first, int end) {
     int const width = walk.map->GetMapWidth();
     if (row < 0 || std::size_t(row) >= walk.started.size() || walk.started[std::size_t(row)] != 0 ||
         width <= 0) {
         return;
     }
     walk.started[std::size_t(row)] = 1;
-    std::memset(EntryAt(*walk.map, 0, row), 0xFF, 2 * std::size_t(width) * sizeof(unsigned short));
+    int const kept_first = std::max(0, std::min(first, width));
+    int const kept_end = std::max(kept_first, std::min(end, width));
+    unsigned short* const entries = EntryAt(*walk.map, 0, row);
+    std::memset(entries, 0xFF, 2 * std::size_t(kept_first) * sizeof(unsigned short));
+    std::memset(entries + 2 * std::size_t(kept_end), 0xFF,
+                2 * std::size_t(width - kept_end) * sizeof(unsigned short));
 }
 
 void View::FinishRows(MapWalk& walk) {

@@ -129,6 +129,8 @@ protected:
     /// entries just before it writes the row, while the row is in the cache, and FinishRows fills
     /// the rows that it never started.
     static void StartRow(MapWalk& walk, int row);
+    /// As StartRow, for a builder that then writes the entries from `first` up to `end` itself.
+    static void StartRow(MapWalk& walk, int row, int first, int end);
     static void FinishRows(MapWalk& walk);
     /// A map of the output's size whose entries are yet to be filled; an output too large for a
     /// table throws ENOMEM.
