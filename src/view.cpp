@@ -244,33 +244,43 @@ View::~View() = default;
 
 void View::OnAspectRatioChange(_DEWARP_ASPECT_RATIO old_ratio, _DEWARP_ASPECT_RATIO new_ratio) {
     AbstractView::OnAspectRatioChange(old_ratio, new_ratio);
-    image_map.reset();
+    DropMap();
 }
 
 void View::OnSizeChange(Resolution const& old_size, Resolution const& new_size) {
     AbstractView::OnSizeChange(old_size, new_size);
-    image_map.reset();
+    DropMap();
 }
 
 void View::OnOutputChange(Resolution const& old_size, _DEWARP_ASPECT_RATIO old_ratio,
                           Resolution const& new_size, _DEWARP_ASPECT_RATIO new_ratio) {
     AbstractView::OnOutputChange(old_size, old_ratio, new_size, new_ratio);
-    image_map.reset();
+    DropMap();
 }
 
 void View::OnZoomChange(PtzPosition const& old_ptz, PtzPosition const& new_ptz) {
     AbstractView::OnZoomChange(old_ptz, new_ptz);
-    image_map.reset();
+    DropMap();
 }
 
 void View::OnOrientationChange(PtzPosition const& old_ptz, PtzPosition const& new_ptz) {
     AbstractView::OnOrientationChange(old_ptz, new_ptz);
-    image_map.reset();
+    DropMap();
 }
 
 void View::OnPtzChange(PtzPosition const& old_ptz, PtzPosition const& new_ptz) {
     AbstractView::OnPtzChange(old_ptz, new_ptz);
-    image_map.reset();
+    DropMap();
+}
+
+// The dropped table is kept for the next build of the same size, which fills it in place rather
+// than allocate another beside it: a move then costs no allocation, and the frame that follows
+// finds more of its source picture still in the cache.
+void View::DropMap() {
+    if (image_map) {
+        spare_map = image_map;
+        image_map.reset();
+    }
 }
 
 // The map is used through the view's own pointer, not a copy: the channel's write lock is what
@@ -496,7 +506,16 @@ boost::shared_ptr<SimpleImageMap> View::NewImageMap() const {
         throw Error(CodeLocation("src/view", "View", "NewImageMap", __LINE__), ENOMEM,
                     "Invalid image map size");
     }
-    boost::shared_ptr<SimpleImageMap> const map(new SimpleImageMap());
+    boost::shared_ptr<SimpleImageMap> map;
+    // Only a table that no one else holds any more may be written again.
+    if (spare_map && spare_map.use_count() == 1 &&
+        spare_map->GetMapWidth() == static_cast<int>(width) &&
+        spare_map->GetMapHeight() == static_cast<int>(height)) {
+        map.swap(spare_map);
+        return map;
+    }
+    spare_map.reset();
+    map.reset(new SimpleImageMap());
     map->ReserveMapSize(static_cast<int>(width), static_cast<int>(height));
     return map;
 }

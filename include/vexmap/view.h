@@ -140,6 +140,13 @@ protected:
     static unsigned short* EntryAt(SimpleImageMap const& map, int column, int row);
 
     boost::shared_ptr<SimpleImageMap> image_map;  // null when none is valid
+
+private:
+    /// Drops image_map for a change, keeping its table for the next build.
+    void DropMap();
+
+    // The last dropped map, or null; taken by the next build (NewImageMap), hence mutable.
+    mutable boost::shared_ptr<SimpleImageMap> spare_map;
 };
 
 }  // namespace quorvel::vexmap

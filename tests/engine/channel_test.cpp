@@ -42,13 +42,18 @@
 
 namespace {
 
-// Counts the allocations of every thread while counting is on.
+// Counts the allocations of every thread while counting is on, and apart those of a megabyte or
+// more: a map's table.
 std::atomic<bool> g_counting(false);
 std::atomic<long> g_allocations(0);
+std::atomic<long> g_large_allocations(0);
 
-void CountAllocation() {
+void CountAllocation(std::size_t size) {
     if (g_counting.load()) {
         g_allocations.fetch_add(1);
+        if (size >= (std::size_t(1) << 20)) {
+            g_large_allocations.fetch_add(1);
+        }
     }
 }
 
@@ -65,17 +70,17 @@ void __libc_free(void* memory);
 // NOLINTEND(bugprone-reserved-identifier)
 
 __attribute__((visibility("default"))) void* malloc(std::size_t size) noexcept {
-    CountAllocation();
+    CountAllocation(size);
     return __libc_malloc(size);
 }
 
 __attribute__((visibility("default"))) void* calloc(std::size_t count, std::size_t size) noexcept {
-    CountAllocation();
+    CountAllocation(count * size);
     return __libc_calloc(count, size);
 }
 
 __attribute__((visibility("default"))) void* realloc(void* memory, std::size_t size) noexcept {
-    CountAllocation();
+    CountAllocation(size);
     return __libc_realloc(memory, size);
 }
 
@@ -589,6 +594,31 @@ TEST(Channel, DewarpImageAllocatesNothingAfterTheFirstFrame) {
     ASSERT_TRUE(first && second && third);
     EXPECT_LT(0, first_allocations);  // the map; shows that the counting works
     EXPECT_EQ(0, g_allocations.load());
+#endif
+}
+
+// A move drops the map, and the next frame builds the new one in the same table: an operator's
+// drag allocates no table.
+TEST(Channel, AMoveAndTheNextFrameAllocateNoNewTable) {
+#ifdef VEXMAP_TEST_UNDER_ASAN
+    GTEST_SKIP() << "AddressSanitizer owns malloc, so allocations cannot be counted";
+#else
+    Channel channel(Lens(2880), DEWARP_INTERNAL_CAMERA_MOUNT_CEILING);
+    ASSERT_TRUE(channel.SetView(DEWARP_VIEW_SINGLE_PTZ));
+    Frame const source(2880, 2880);
+    Frame first(1920, 1080);
+    Frame moved(1920, 1080);
+    g_large_allocations = 0;
+    g_counting = true;
+    ASSERT_TRUE(channel.DewarpImage(source.Image(), first.Image()));
+    long const first_tables = g_large_allocations.exchange(0);
+    _DEWARP_PTZ_POSITION position = {30.0f, 50.0f, 0.0f, 1.5f};
+    ASSERT_TRUE(channel.SetPtz(position));
+    ASSERT_TRUE(channel.DewarpImage(source.Image(), moved.Image()));
+    g_counting = false;
+    EXPECT_EQ(1, first_tables);  // shows that the counting sees a table
+    EXPECT_EQ(0, g_large_allocations.load());
+    EXPECT_NE(first.Pixels(), moved.Pixels());
 #endif
 }
 
