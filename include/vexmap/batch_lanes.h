@@ -4,10 +4,11 @@
 
 namespace quorvel::vexmap {
 
-/// One width of vector lanes for `BatchTrigonometry`: the same operations, each over an array of
-/// floats, for SSE2 (4 lanes, every x86-64 processor), AVX2 with FMA (8) or AVX-512F (16). The
-/// wider tables are compiled for their instructions alone and may be called only where the
-/// processor has them (`Supported`). Plain data; any thread.
+/// One width of vector lanes: the engine's kernels over arrays (the trigonometry of
+/// `BatchTrigonometry`, the links of `BatchChain`, the span store of the map builders, the 4:2:0
+/// remap), the same operations for SSE2 (4 lanes, every x86-64 processor), AVX2 with FMA (8) or
+/// AVX-512F (16). The wider tables are compiled for their instructions alone and may be called
+/// only where the processor has them (`Supported`). Plain data; any thread.
 struct BatchLanes {
     /// One block row of SimpleImageMap::RemapYuv420Planar: the table rows of its two output rows,
     /// the source planes and the Frame numbers of its test (all 32-bit, as the plain path has
