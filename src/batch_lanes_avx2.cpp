@@ -13,7 +13,85 @@ struct Avx2Lane {
     static constexpr int WIDTH = 8;
     // The library's code and ours use only the sixteen registers that vzeroupper clears.
     static void Leave() { _mm256_zeroupper(); }
-    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const&) { return 0; }
+    // a < b for unsigned 32-bit lanes, through the signed compare with the sign bits flipped.
+    static __m256i Below(__m256i a, __m256i b) {
+        __m256i const sign = _mm256_set1_epi32(int(0x80000000u));
+        return _mm256_cmpgt_epi32(_mm256_xor_si256(b, sign), _mm256_xor_si256(a, sign));
+    }
+    // The low byte of each of eight dwords, in order, as eight bytes.
+    static __m128i LowBytes(__m256i dwords) {
+        __m256i const bytes = _mm256_shuffle_epi8(
+            dwords, _mm256_setr_epi8(0, 4, 8, 12, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, 0,
+                                     4, 8, 12, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1));
+        return _mm256_castsi256_si128(
+            _mm256_permutevar8x32_epi32(bytes, _mm256_setr_epi32(0, 4, 1, 1, 1, 1, 1, 1)));
+    }
+    // Eight luma samples of one table row: the low byte of the dword at each index, 16 where the
+    // plain test fails. The dword reaches three bytes past the sample, into the chroma planes.
+    static __m128i LumaEight(__m256i entries, BatchLanes::Yuv420Row const& row) {
+        __m256i const x = _mm256_and_si256(entries, _mm256_set1_epi32(0xFFFF));
+        __m256i const y = _mm256_srli_epi32(entries, 16);
+        __m256i const index =
+            _mm256_add_epi32(_mm256_mullo_epi32(y, _mm256_set1_epi32(int(row.stride))), x);
+        __m256i const inside = _mm256_and_si256(Below(index, _mm256_set1_epi32(int(row.plane))),
+                                                Below(x, _mm256_set1_epi32(int(row.width))));
+        __m256i const samples = _mm256_mask_i32gather_epi32(
+            _mm256_set1_epi32(16), reinterpret_cast<int const*>(row.luma), index, inside, 1);
+        return LowBytes(samples);
+    }
+    // Eight chroma samples from one plane: the dword that ends at each sample, so that nothing
+    // past the frame's last plane is read; its top byte, or 128 where the plain test fails.
+    static __m128i ChromaEight(__m256i index, __m256i inside, unsigned char const* plane) {
+        __m256i const samples =
+            _mm256_mask_i32gather_epi32(_mm256_set1_epi32(128 << 24),
+                                        reinterpret_cast<int const*>(plane - 3), index, inside, 1);
+        return LowBytes(_mm256_srli_epi32(samples, 24));
+    }
+    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const& row) {
+        if (row.plane < 64 || row.plane >= 0x80000000u) {
+            return 0;
+        }
+        uint32_t const chroma_limit = row.plane >> 2;
+        uint32_t done = 0;
+        for (; done + 8 <= row.blocks; done += 8) {
+            __m256i const top_left =
+                _mm256_loadu_si256(reinterpret_cast<__m256i const*>(row.top + 4 * done));
+            __m256i const top_right =
+                _mm256_loadu_si256(reinterpret_cast<__m256i const*>(row.top + 4 * done + 16));
+            __m256i const bottom_left =
+                _mm256_loadu_si256(reinterpret_cast<__m256i const*>(row.bottom + 4 * done));
+            __m256i const bottom_right =
+                _mm256_loadu_si256(reinterpret_cast<__m256i const*>(row.bottom + 4 * done + 16));
+            _mm_storel_epi64(reinterpret_cast<__m128i*>(row.top_out + 2 * done),
+                             LumaEight(top_left, row));
+            _mm_storel_epi64(reinterpret_cast<__m128i*>(row.top_out + 2 * done + 8),
+                             LumaEight(top_right, row));
+            _mm_storel_epi64(reinterpret_cast<__m128i*>(row.bottom_out + 2 * done),
+                             LumaEight(bottom_left, row));
+            _mm_storel_epi64(reinterpret_cast<__m128i*>(row.bottom_out + 2 * done + 8),
+                             LumaEight(bottom_right, row));
+            // The table entry of each block's top left pixel: the even entries of the top row.
+            __m256i const corners = _mm256_permute4x64_epi64(
+                _mm256_castps_si256(_mm256_shuffle_ps(_mm256_castsi256_ps(top_left),
+                                                      _mm256_castsi256_ps(top_right), 0x88)),
+                0xD8);
+            __m256i const x = _mm256_and_si256(corners, _mm256_set1_epi32(0xFFFF));
+            __m256i const y = _mm256_srli_epi32(corners, 16);
+            __m256i const index =
+                _mm256_add_epi32(_mm256_srli_epi32(x, 1),
+                                 _mm256_mullo_epi32(_mm256_srli_epi32(y, 1),
+                                                    _mm256_set1_epi32(int(row.chroma_stride))));
+            __m256i const inside =
+                _mm256_and_si256(Below(index, _mm256_set1_epi32(int(chroma_limit))),
+                                 Below(x, _mm256_set1_epi32(int(row.width))));
+            _mm_storel_epi64(reinterpret_cast<__m128i*>(row.u_out + done),
+                             ChromaEight(index, inside, row.u_plane));
+            _mm_storel_epi64(reinterpret_cast<__m128i*>(row.v_out + done),
+                             ChromaEight(index, inside, row.v_plane));
+        }
+        Leave();
+        return done;
+    }
     static Pack Load(float const* p) { return _mm256_loadu_ps(p); }
     static void Store(float* p, Pack v) { _mm256_storeu_ps(p, v); }
     static Pack Fill(float v) { return _mm256_set1_ps(v); }
