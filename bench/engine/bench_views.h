@@ -13,16 +13,20 @@ constexpr int SOURCE_SIZE = 2880;
 constexpr float FISHEYE_DEGREES = 183.0f;
 constexpr float OFF_AXIS_DEGREES = 30.0f;
 
-/// The camera of the benchmarks: a 183-degree circular fisheye on a 2880 x 2880 sensor, on a
-/// wall so that a pan turns the view off the lens axis.
+/// The lens of the benchmarks: a 183-degree circular fisheye on a 2880 x 2880 sensor.
+inline _DEWARP_INTERNAL_CAMERA_MODEL BenchModel() {
+    return {DEWARP_INTERNAL_CAMERA_TYPE_CIRCULAR_FISHEYE,
+            FISHEYE_DEGREES,
+            FISHEYE_DEGREES,
+            FISHEYE_DEGREES,
+            SOURCE_SIZE,
+            SOURCE_SIZE};
+}
+
+/// The camera of the benchmarks, on the given mount: on a wall a pan turns the view off the lens
+/// axis.
 inline boost::shared_ptr<Camera> MakeBenchCamera(_DEWARP_INTERNAL_CAMERA_MOUNT mount) {
-    _DEWARP_INTERNAL_CAMERA_MODEL const model = {DEWARP_INTERNAL_CAMERA_TYPE_CIRCULAR_FISHEYE,
-                                                 FISHEYE_DEGREES,
-                                                 FISHEYE_DEGREES,
-                                                 FISHEYE_DEGREES,
-                                                 SOURCE_SIZE,
-                                                 SOURCE_SIZE};
-    return boost::shared_ptr<Camera>(CameraBuilder::MakeCamera(model, mount));
+    return boost::shared_ptr<Camera>(CameraBuilder::MakeCamera(BenchModel(), mount));
 }
 
 /// A 90-degree rectilinear PTZ view looking 30 degrees off the lens axis, filling the output.

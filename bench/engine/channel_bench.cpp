@@ -84,12 +84,7 @@ private:
 // `two_over_one` is the elapsed time of the frame in two bands on two threads over that of the
 // frame in one band, the fastest of each from runs in turns: at most 0.6 on two free cores.
 void BM_Channel_TwoBandsOnTwoThreads(benchmark::State& state) {
-    _DEWARP_INTERNAL_CAMERA_MODEL const model = {DEWARP_INTERNAL_CAMERA_TYPE_CIRCULAR_FISHEYE,
-                                                 FISHEYE_DEGREES,
-                                                 FISHEYE_DEGREES,
-                                                 FISHEYE_DEGREES,
-                                                 SOURCE_SIZE,
-                                                 SOURCE_SIZE};
+    _DEWARP_INTERNAL_CAMERA_MODEL const model = BenchModel();
     void* const channel =
         dewarp_internal_open(&model, DEWARP_INTERNAL_CAMERA_MOUNT_CEILING, nullptr);
     Frame const source(SOURCE_SIZE, SOURCE_SIZE);

@@ -9,6 +9,7 @@
 #include <boost/shared_ptr.hpp>
 #include <gtest/gtest.h>
 
+#include "available_lanes.h"
 #include "vexmap/batch_lanes.h"
 #include "vexmap/map_functors.h"
 #include "vexmap/projection_functor.h"
@@ -143,16 +144,6 @@ TEST(BatchChain, NestedChainsRunInTheirOrder) {
     ExpectAsPointByPoint(outer, Row(), POINT_TOLERANCE);
 }
 
-std::vector<BatchLanes const*> AvailableLanes() {
-    std::vector<BatchLanes const*> lanes = {&BatchLanes::Sse2()};
-    for (BatchLanes const* wide : {&BatchLanes::Avx2(), &BatchLanes::Avx512()}) {
-        if (wide->Supported()) {
-            lanes.push_back(wide);
-        }
-    }
-    return lanes;
-}
-
 /// The builders' plain span store, reached from a test.
 struct SpanStore : View {
     using View::StoreSpan;
@@ -208,10 +199,7 @@ TEST_P(BatchLanesStoreTest, StoresEighthSpansWordForWordAsThePlainStore) {
 }
 
 INSTANTIATE_TEST_SUITE_P(EveryLaneWidthOfThisProcessor, BatchLanesStoreTest,
-                         testing::ValuesIn(AvailableLanes()),
-                         [](testing::TestParamInfo<BatchLanes const*> const& lanes) {
-                             return std::string(lanes.param->name);
-                         });
+                         testing::ValuesIn(AvailableLanes()), LanesName);
 
 }  // namespace
 }  // namespace quorvel::vexmap

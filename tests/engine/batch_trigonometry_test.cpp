@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include "available_lanes.h"
 #include "vexmap/batch_lanes.h"
 #include "vexmap/floating_point.h"
 #include "vexmap/trigonometry.h"
@@ -38,16 +39,6 @@ int64_t UlpDistance(float a, float b) {
     };
     int64_t const d = ordered(a) - ordered(b);
     return d < 0 ? -d : d;
-}
-
-std::vector<BatchLanes const*> AvailableLanes() {
-    std::vector<BatchLanes const*> lanes = {&BatchLanes::Sse2()};
-    for (BatchLanes const* wide : {&BatchLanes::Avx2(), &BatchLanes::Avx512()}) {
-        if (wide->Supported()) {
-            lanes.push_back(wide);
-        }
-    }
-    return lanes;
 }
 
 // Angles and ratios over the ranges a map build meets, with an odd count so that every width
@@ -238,10 +229,7 @@ TEST_P(WideLanesTest, EveryFunctionLeavesTheWideRegistersClean) {
 }
 
 INSTANTIATE_TEST_SUITE_P(EveryLaneWidthOfThisProcessor, BatchLanesTest,
-                         testing::ValuesIn(AvailableLanes()),
-                         [](testing::TestParamInfo<BatchLanes const*> const& lanes) {
-                             return std::string(lanes.param->name);
-                         });
+                         testing::ValuesIn(AvailableLanes()), LanesName);
 
 std::vector<BatchLanes const*> WideLanes() {
     std::vector<BatchLanes const*> lanes = AvailableLanes();
@@ -252,10 +240,7 @@ std::vector<BatchLanes const*> WideLanes() {
 // An SSE2-only processor has no wide lanes to test.
 GTEST_ALLOW_UNINSTANTIATED_PARAMETERIZED_TEST(WideLanesTest);
 INSTANTIATE_TEST_SUITE_P(EveryWideLaneWidthOfThisProcessor, WideLanesTest,
-                         testing::ValuesIn(WideLanes()),
-                         [](testing::TestParamInfo<BatchLanes const*> const& lanes) {
-                             return std::string(lanes.param->name);
-                         });
+                         testing::ValuesIn(WideLanes()), LanesName);
 
 TEST(BatchTrigonometry, UsesTheWidestLanesThisProcessorRuns) {
     EXPECT_STREQ(BatchTrigonometry::GetLanesName(), AvailableLanes().back()->name);

@@ -11,6 +11,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "available_lanes.h"
 #include "recording_log_sink.h"
 #include "vexmap/batch_lanes.h"
 
@@ -1227,16 +1228,6 @@ TEST(SimpleImageMapRows, ABandOffTheBlocksOrPastTheEndIsRefusedAndWritesNothing)
 namespace quorvel::vexmap {
 namespace {
 
-std::vector<BatchLanes const*> AvailableLanes() {
-    std::vector<BatchLanes const*> lanes = {&BatchLanes::Sse2()};
-    for (BatchLanes const* wide : {&BatchLanes::Avx2(), &BatchLanes::Avx512()}) {
-        if (wide->Supported()) {
-            lanes.push_back(wide);
-        }
-    }
-    return lanes;
-}
-
 class SimpleImageMapLanesTest : public testing::TestWithParam<BatchLanes const*> {};
 
 // Random tables (inside, on the edges, past them, unmapped) over random sizes and strides: every
@@ -1295,10 +1286,7 @@ TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathForALargeView) {
 }
 
 INSTANTIATE_TEST_SUITE_P(EveryLaneWidthOfThisProcessor, SimpleImageMapLanesTest,
-                         testing::ValuesIn(AvailableLanes()),
-                         [](testing::TestParamInfo<BatchLanes const*> const& lanes) {
-                             return std::string(lanes.param->name);
-                         });
+                         testing::ValuesIn(AvailableLanes()), LanesName);
 
 }  // namespace
 }  // namespace quorvel::vexmap
