@@ -4,7 +4,9 @@
 #include <cmath>
 #include <cstring>
 
+#include "MapReplay.h"
 #include "ProcessorAssert.h"
+#include "ReplayPixel.h"
 
 namespace {
 
@@ -12,38 +14,6 @@ constexpr double PI = 3.14159265358979323846;
 // The panorama spans 2 pi / PANORAMA_TURN of the circle's circumference in its columns.
 constexpr double PANORAMA_TURN = 1.5037593984962405;
 constexpr double PANORAMA_SPAN = 4.178318229274425;  // 2 pi / PANORAMA_TURN
-
-// One sample of a bilinear blend of the 2 x 2 cell at (x, y), in single precision; the sum is
-// truncated and only its lower 8 bits are kept.
-unsigned char GetAveragePixelValue(unsigned char const* data, int stride, int bytes, int x, int y,
-                                   int channel, float fx, float fy) {
-    unsigned char const* p = data + std::size_t(y) * std::size_t(stride) +
-                             std::size_t(x) * std::size_t(bytes) + std::size_t(channel);
-    unsigned char const* n = p + stride;
-    float const sum = float(p[0]) * (1.0f - fy) * (1.0f - fx) + float(p[bytes]) * (1.0f - fy) * fx +
-                      float(n[0]) * fy * (1.0f - fx) + float(n[bytes]) * fy * fx;
-    return static_cast<unsigned char>(uint32_t(int(sum)) & 0xFFu);
-}
-
-void BlendPixel(unsigned char const* data, int stride, int bytes, int x, int y, float fx, float fy,
-                unsigned char* pixel) {
-    for (int channel = 0; channel < bytes; ++channel) {
-        pixel[channel] = GetAveragePixelValue(data, stride, bytes, x, y, channel, fx, fy);
-    }
-}
-
-uint32_t PackEntry(int x, int y) {
-    return (uint32_t(y) & 0xFFFFu) << 16 | (uint32_t(x) & 0xFFFFu);
-}
-
-// The row is the upper half of an entry read as a signed 16-bit number.
-int EntryRow(uint32_t entry) {
-    return int((entry >> 16) ^ 0x8000u) - 0x8000;
-}
-
-int EntryColumn(uint32_t entry) {
-    return int(entry & 0xFFFFu);
-}
 
 }  // namespace
 
@@ -165,7 +135,7 @@ void ImageProcessor::SamplePixel(double x, double y, bool outside, int interpola
     int const ix = inside ? int(column) : -1;
     int const iy = inside ? int(row) : -1;
     if (slot.entry != nullptr) {
-        *slot.entry = PackEntry(ix, iy);
+        *slot.entry = ReplayPixel::PackEntry(ix, iy);
     }
     if (!inside) {
         memset(pixel, 0, bytes);
@@ -185,37 +155,9 @@ void ImageProcessor::SamplePixel(double x, double y, bool outside, int interpola
     // Interpolation 2 copies here and blends only on replay: a new view is nearest, the frames
     // after it blended.
     if (interpolation == 1) {
-        BlendPixel(input.Data, input.Stride, int(bytes), ix, iy, fx, fy, pixel);
+        ReplayPixel::Blend(input.Data, input.Stride, int(bytes), ix, iy, fx, fy, pixel);
     } else {
         memcpy(pixel, source, bytes);
-    }
-}
-
-// Any interpolation but 0 blends on replay; entries beyond the present input show black.
-void ImageProcessor::ReplayMap(uint32_t const* map,
-                               ImageProcessorPrivateData::Fraction const* fractions,
-                               int interpolation, ImageData& output, int width, int height) const {
-    int const bytes = output.BitsPerPixel / 8;
-    for (int row = 0; row < height; ++row) {
-        unsigned char* pixel = output.Data + std::size_t(row) * std::size_t(output.Stride);
-        std::size_t const first = std::size_t(row) * std::size_t(width);
-        for (int column = 0; column < width; ++column, pixel += bytes) {
-            uint32_t const entry = map[first + std::size_t(column)];
-            int const x = EntryColumn(entry);
-            int const y = EntryRow(entry);
-            if (y < 0 || x >= input.Width || y >= input.Height) {
-                memset(pixel, 0, std::size_t(bytes));
-            } else if (interpolation != 0 && x != input.Width - 1 && y != input.Height - 1) {
-                ImageProcessorPrivateData::Fraction const fraction =
-                    fractions[first + std::size_t(column)];
-                BlendPixel(input.Data, input.Stride, bytes, x, y, fraction.x, fraction.y, pixel);
-            } else {
-                memcpy(pixel,
-                       input.Data + std::size_t(y) * std::size_t(input.Stride) +
-                           std::size_t(x) * std::size_t(bytes),
-                       std::size_t(bytes));
-            }
-        }
     }
 }
 
@@ -241,8 +183,8 @@ void ImageProcessor::InnerProcessImage() {
         }
     }
     if (reuse) {
-        ReplayMap(data->PtzMap.data(), data->PtzFractions.data(), p.OutputInterpolation, ptzOutput,
-                  p.OutputWidth, p.OutputHeight);
+        MapReplay(input, data->PtzMap.data(), data->PtzFractions.data())
+            .Into(ptzOutput, p.OutputWidth, p.OutputHeight, p.OutputInterpolation);
         return;
     }
     int const bytes = ptzOutput.BitsPerPixel / 8;
@@ -310,8 +252,8 @@ void ImageProcessor::InnerProcessPanoramaImage() {
         data->PanoramaMapValid = true;
     }
     if (reuse) {
-        ReplayMap(data->PanoramaMap.data(), data->PanoramaFractions.data(), p.PanoramaInterpolation,
-                  panoramaOutput, p.PanoramaWidth, p.PanoramaHeight);
+        MapReplay(input, data->PanoramaMap.data(), data->PanoramaFractions.data())
+            .Into(panoramaOutput, p.PanoramaWidth, p.PanoramaHeight, p.PanoramaInterpolation);
         return;
     }
     if (p.CircleRadius <= 0) {

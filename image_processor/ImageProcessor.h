@@ -56,8 +56,6 @@ private:
     bool CanRender(ImageData const& output, int width, int height) const;
     void SamplePixel(double x, double y, bool outside, int interpolation, MapSlot slot,
                      int pixel_bytes, unsigned char* pixel) const;
-    void ReplayMap(uint32_t const* map, ImageProcessorPrivateData::Fraction const* fractions,
-                   int interpolation, ImageData& output, int width, int height) const;
 
     ImageProcessorPrivateData* data;
     ImageProcessorParams parameters;
