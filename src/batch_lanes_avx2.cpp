@@ -55,7 +55,9 @@ struct Avx2Lane {
     static __m128i ChromaEight(__m256i index, __m256i inside, unsigned char const* plane) {
         return BytesAt(plane, index, inside, char(128));
     }
-    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const& row) {
+    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const& frame_row) {
+        // A copy of its own: the output stores cannot alias it, so its fields stay in registers.
+        BatchLanes::Yuv420Row const row = frame_row;
         if (row.plane < 64 || row.plane >= 0x80000000u) {
             return 0;
         }

@@ -1,5 +1,8 @@
-// AVX-512F, 16 lanes. Compiled with -mavx512f: nothing here may run before Supported() has said
-// yes, so everything but the table itself has internal linkage.
+// AVX-512, 16 lanes. Compiled with -mavx512f -mavx512bw -mavx512vl -mavx512vbmi: nothing here may
+// run before Supported() has said yes to all four, so everything but the table itself has internal
+// linkage. A processor with the foundation alone (the first generations) takes the AVX2 table.
+#include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <immintrin.h>
 #include <sleef.h>
@@ -52,8 +55,76 @@ struct Avx512Lane {
         __m128i const chosen = _mm512_cvtepi32_epi8(_mm512_maskz_set1_epi32(inside, -1));
         return _mm_blendv_epi8(_mm_set1_epi8(fill), bytes, chosen);
     }
-    // Sixteen luma samples of one table row, 16 where the plain test fails.
-    static __m128i LumaSixteen(__m512i entries, BatchLanes::Yuv420Row const& row) {
+    // Where sixteen samples of a plane lie, and how to read them. Along a row of a view's table
+    // neighbouring entries lie close together in the source: most groups of sixteen fall within
+    // a window of 4 rows of 32 bytes, which four loads and one byte permutation read at once.
+    struct Pick {
+        bool windowed;
+        size_t start;      // the window's first byte, (y0 * stride + x0)
+        __m128i place;     // each lane's byte in the window, (y - y0) * 32 + (x - x0)
+        __m512i index;     // the plain index, y * stride + x, for a group that no window holds
+        __mmask16 inside;  // the lanes that the plain test lets through
+    };
+    static constexpr uint32_t WINDOW_WIDTH = 32;
+    static constexpr uint32_t WINDOW_ROWS = 4;
+    // The window starts at the lower of the first and the last lane's row, and 8 columns left of
+    // the lower of their columns, so that a group that runs either way, or bulges a little, fits.
+    // It must lie wholly within the plane's bytes (in 64 bits: a window never wraps as a 32-bit
+    // index may), and every lane that the plain test lets through must lie in it.
+    static Pick Plan(__m512i x, __m512i y, __m512i index, __mmask16 inside, uint32_t stride,
+                     uint32_t plane_bytes) {
+        Pick pick{false, 0, _mm_setzero_si128(), index, inside};
+        // The lower of the first and the last lane, in every lane.
+        auto const lower_end = [](__m512i v) {
+            return _mm512_min_epu32(_mm512_broadcastd_epi32(_mm512_castsi512_si128(v)),
+                                    _mm512_permutexvar_epi32(_mm512_set1_epi32(15), v));
+        };
+        __m512i const eight = _mm512_set1_epi32(8);
+        __m512i const left = _mm512_sub_epi32(_mm512_max_epu32(lower_end(x), eight), eight);
+        __m512i const top = lower_end(y);
+        uint32_t const x0 = uint32_t(_mm_cvtsi128_si32(_mm512_castsi512_si128(left)));
+        uint32_t const y0 = uint32_t(_mm_cvtsi128_si32(_mm512_castsi512_si128(top)));
+        uint64_t const start = uint64_t(y0) * stride + x0;
+        if (start + uint64_t(WINDOW_ROWS - 1) * stride + WINDOW_WIDTH > plane_bytes) {
+            return pick;
+        }
+        __m512i const dx = _mm512_sub_epi32(x, left);
+        __m512i const dy = _mm512_sub_epi32(y, top);
+        __mmask16 const held =
+            _kand_mask16(_mm512_cmplt_epu32_mask(dx, _mm512_set1_epi32(int(WINDOW_WIDTH))),
+                         _mm512_cmplt_epu32_mask(dy, _mm512_set1_epi32(int(WINDOW_ROWS))));
+        if (_kandn_mask16(held, inside) != 0) {
+            return pick;
+        }
+        pick.windowed = true;
+        pick.start = size_t(start);
+        pick.place = _mm512_cvtepi32_epi8(_mm512_add_epi32(_mm512_slli_epi32(dy, 5), dx));
+        return pick;
+    }
+    // The bytes that the pick names in a plane, `fill` where a lane is not inside.
+    static __m128i Read(unsigned char const* plane, uint32_t stride, Pick const& pick, char fill) {
+        if (!pick.windowed) {
+            return BytesAt(plane, pick.index, pick.inside, fill);
+        }
+        unsigned char const* row = plane + pick.start;
+        auto const load = [&](uint32_t k) {
+            return _mm256_loadu_si256(reinterpret_cast<__m256i const*>(row + size_t(k) * stride));
+        };
+        __m512i const upper = _mm512_inserti64x4(_mm512_castsi256_si512(load(0)), load(1), 1);
+        __m512i const lower = _mm512_inserti64x4(_mm512_castsi256_si512(load(2)), load(3), 1);
+        __m512i const samples =
+            _mm512_permutex2var_epi8(upper, _mm512_castsi128_si512(pick.place), lower);
+        return _mm_mask_blend_epi8(pick.inside, _mm_set1_epi8(fill),
+                                   _mm512_castsi512_si128(samples));
+    }
+    /// Sixteen samples of a plane: the lanes' coordinates, their plain index and the plain test.
+    struct Lookups {
+        __m512i x;
+        __m512i y;
+        __m512i index;
+        __mmask16 inside;
+    };
+    static Lookups LumaLookups(__m512i entries, BatchLanes::Yuv420Row const& row) {
         __m512i const x = _mm512_and_si512(entries, _mm512_set1_epi32(0xFFFF));
         __m512i const y = _mm512_srli_epi32(entries, 16);
         __m512i const index =
@@ -61,48 +132,70 @@ struct Avx512Lane {
         __mmask16 const inside =
             _kand_mask16(_mm512_cmplt_epu32_mask(index, _mm512_set1_epi32(int(row.plane))),
                          _mm512_cmplt_epu32_mask(x, _mm512_set1_epi32(int(row.width))));
-        return BytesAt(row.luma, index, inside, 16);
+        return {x, y, index, inside};
     }
-    // Sixteen chroma samples from one plane, 128 where the plain test fails.
-    static __m128i ChromaSixteen(__m512i index, __mmask16 inside, unsigned char const* plane) {
-        return BytesAt(plane, index, inside, char(128));
+    // The chroma of sixteen blocks, from the table entry of each block's top left pixel: the even
+    // entries of the two halves of the block row's top row.
+    static Lookups ChromaLookups(__m512i top_left, __m512i top_right,
+                                 BatchLanes::Yuv420Row const& row) {
+        __m512i const even =
+            _mm512_setr_epi32(0, 2, 4, 6, 8, 10, 12, 14, 16, 18, 20, 22, 24, 26, 28, 30);
+        __m512i const corners = _mm512_permutex2var_epi32(top_left, even, top_right);
+        __m512i const x = _mm512_and_si512(corners, _mm512_set1_epi32(0xFFFF));
+        __m512i const chroma_x = _mm512_srli_epi32(x, 1);
+        __m512i const chroma_y = _mm512_srli_epi32(corners, 17);
+        __m512i const index = _mm512_add_epi32(
+            chroma_x, _mm512_mullo_epi32(chroma_y, _mm512_set1_epi32(int(row.chroma_stride))));
+        __mmask16 const inside =
+            _kand_mask16(_mm512_cmplt_epu32_mask(index, _mm512_set1_epi32(int(row.plane >> 2))),
+                         _mm512_cmplt_epu32_mask(x, _mm512_set1_epi32(int(row.width))));
+        return {chroma_x, chroma_y, index, inside};
     }
-    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const& row) {
+    static constexpr uint32_t SCATTERED_RUNS_TO_LEAVE = 2;
+    // Sixteen luma samples of one table row, 16 where the plain test fails, stored at `target`;
+    // whether a window held them.
+    static bool LumaSixteen(__m512i entries, BatchLanes::Yuv420Row const& row,
+                            unsigned char* target) {
+        Pick const pick = Plan(LumaLookups(entries, row), row.stride, row.plane);
+        _mm_storeu_si128(reinterpret_cast<__m128i*>(target), Read(row.luma, row.stride, pick, 16));
+        return pick.windowed;
+    }
+    static Pick Plan(Lookups const& lookups, uint32_t stride, uint32_t plane_bytes) {
+        return Plan(lookups.x, lookups.y, lookups.index, lookups.inside, stride, plane_bytes);
+    }
+    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const& frame_row) {
+        // A copy of its own: the output stores cannot alias it, so its fields stay in registers.
+        BatchLanes::Yuv420Row const row = frame_row;
         if (row.plane < 64 || row.plane >= 0x80000000u) {
             return 0;
         }
-        // The table entry of each block's top left pixel: the even entries of the top row.
-        __m512i const even =
-            _mm512_setr_epi32(0, 2, 4, 6, 8, 10, 12, 14, 16, 18, 20, 22, 24, 26, 28, 30);
-        uint32_t const chroma_limit = row.plane >> 2;
         uint32_t done = 0;
+        uint32_t scattered_runs = 0;
         for (; done + 16 <= row.blocks; done += 16) {
             __m512i const top_left = _mm512_loadu_si512(row.top + 4 * done);
             __m512i const top_right = _mm512_loadu_si512(row.top + 4 * done + 32);
-            __m512i const bottom_left = _mm512_loadu_si512(row.bottom + 4 * done);
-            __m512i const bottom_right = _mm512_loadu_si512(row.bottom + 4 * done + 32);
-            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.top_out + 2 * done),
-                             LumaSixteen(top_left, row));
-            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.top_out + 2 * done + 16),
-                             LumaSixteen(top_right, row));
-            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.bottom_out + 2 * done),
-                             LumaSixteen(bottom_left, row));
-            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.bottom_out + 2 * done + 16),
-                             LumaSixteen(bottom_right, row));
-            __m512i const corners = _mm512_permutex2var_epi32(top_left, even, top_right);
-            __m512i const x = _mm512_and_si512(corners, _mm512_set1_epi32(0xFFFF));
-            __m512i const y = _mm512_srli_epi32(corners, 16);
-            __m512i const index =
-                _mm512_add_epi32(_mm512_srli_epi32(x, 1),
-                                 _mm512_mullo_epi32(_mm512_srli_epi32(y, 1),
-                                                    _mm512_set1_epi32(int(row.chroma_stride))));
-            __mmask16 const inside =
-                _kand_mask16(_mm512_cmplt_epu32_mask(index, _mm512_set1_epi32(int(chroma_limit))),
-                             _mm512_cmplt_epu32_mask(x, _mm512_set1_epi32(int(row.width))));
+            // Whether any group of the sixteen blocks found no window.
+            bool const scattered = !LumaSixteen(top_left, row, row.top_out + 2 * done) |
+                                   !LumaSixteen(top_right, row, row.top_out + 2 * done + 16) |
+                                   !LumaSixteen(_mm512_loadu_si512(row.bottom + 4 * done), row,
+                                                row.bottom_out + 2 * done) |
+                                   !LumaSixteen(_mm512_loadu_si512(row.bottom + 4 * done + 32), row,
+                                                row.bottom_out + 2 * done + 16);
+            // One pick for both chroma planes: they share sizes and indices.
+            Pick const chroma =
+                Plan(ChromaLookups(top_left, top_right, row), row.chroma_stride, row.plane >> 2);
             _mm_storeu_si128(reinterpret_cast<__m128i*>(row.u_out + done),
-                             ChromaSixteen(index, inside, row.u_plane));
+                             Read(row.u_plane, row.chroma_stride, chroma, char(128)));
             _mm_storeu_si128(reinterpret_cast<__m128i*>(row.v_out + done),
-                             ChromaSixteen(index, inside, row.v_plane));
+                             Read(row.v_plane, row.chroma_stride, chroma, char(128)));
+            // Rows of a panorama or a wide view lie scattered over the source, and no window
+            // holds their groups: the plain loop does those rows at least as fast, so a row whose
+            // groups keep missing is left to it.
+            scattered_runs = scattered || !chroma.windowed ? scattered_runs + 1 : 0;
+            if (scattered_runs == SCATTERED_RUNS_TO_LEAVE) {
+                done += 16;
+                break;
+            }
         }
         Leave();
         return done;
@@ -318,10 +411,11 @@ struct Avx512Lane {
 };
 
 bool Avx512Supported() {
-    return __builtin_cpu_supports("avx512f");
+    return __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") &&
+           __builtin_cpu_supports("avx512vl") && __builtin_cpu_supports("avx512vbmi");
 }
 
-constexpr BatchLanes AVX512_LANES = lane_kernels::Table<Avx512Lane>("avx512f", &Avx512Supported);
+constexpr BatchLanes AVX512_LANES = lane_kernels::Table<Avx512Lane>("avx512", &Avx512Supported);
 
 }  // namespace
 

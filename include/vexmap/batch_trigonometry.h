@@ -30,7 +30,7 @@ public:
     /// `Trigonometry::hypot(float, float)` bit for bit: the root of the sum of squares in double.
     static void hypot(float const* x, float const* y, float* out, int count);
 
-    /// The name of the lanes in use: "avx512f", "avx2" or "sse2".
+    /// The name of the lanes in use: "avx512", "avx2" or "sse2".
     static char const* GetLanesName();
 };
 

@@ -1,6 +1,7 @@
 #include "vexmap/simple_image_map.h"
 
 #include <algorithm>
+#include <cmath>
 #include <cstdint>
 #include <new>
 #include <random>
@@ -1283,6 +1284,59 @@ TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathForALargeView) {
     map.RemapWithLanes(BatchLanes::Sse2(), source.image, plain.image);
     map.RemapWithLanes(*GetParam(), source.image, lanes.image);
     EXPECT_TRUE(plain.bytes == lanes.bytes);
+}
+
+// Tables as views make them: neighbouring entries close together, turned, scaled and shifted so
+// that they run over every edge of the source, with a stride wider than the source, a few entries
+// unmapped, and sources narrower than the lanes' windows. The wide lanes read most such groups
+// through one window of the source; every frame is the plain path's, byte for byte.
+TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathForSmoothTablesOverEveryEdge) {
+    struct Source {
+        uint32_t width;
+        uint32_t height;
+        uint32_t stride;
+    };
+    Source const sources[] = {{200, 150, 200}, {200, 150, 203}, {30, 90, 30}, {64, 8, 70}};
+    int const width = 96;
+    int const height = 64;
+    int round = 0;
+    for (Source const& from : sources) {
+        Picture const source =
+            Numbered(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, from.width, from.height, from.stride);
+        for (float const scale : {0.4f, 0.73f, 1.3f}) {
+            for (float const degrees : {0.0f, 7.0f, 90.0f, 185.0f, 300.0f}) {
+                for (float const shift : {-40.0f, 0.0f, 0.7f, 1.0f}) {
+                    ++round;
+                    float const turn = degrees * 3.14159265f / 180.0f;
+                    float const along_x = scale * std::cos(turn);
+                    float const along_y = scale * std::sin(turn);
+                    SimpleImageMap map(width, height);
+                    for (int row = 0; row < height; ++row) {
+                        for (int column = 0; column < width; ++column) {
+                            float const x = shift * float(from.width) + along_x * float(column) -
+                                            along_y * float(row);
+                            float const y = shift * float(from.height) + along_y * float(column) +
+                                            along_x * float(row);
+                            bool const unmapped = (row * width + column) % 97 == 0;
+                            Set(map, uint32_t(column), uint32_t(row),
+                                unmapped ? UNMAPPED
+                                         : static_cast<unsigned short>(std::lround(x) & 0xFFFF),
+                                unmapped ? UNMAPPED
+                                         : static_cast<unsigned short>(std::lround(y) & 0xFFFF));
+                        }
+                    }
+                    Picture plain(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, width, height, width);
+                    Picture lanes(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, width, height, width);
+                    map.RemapWithLanes(BatchLanes::Sse2(), source.image, plain.image);
+                    map.RemapWithLanes(*GetParam(), source.image, lanes.image);
+                    ASSERT_EQ(plain.bytes, lanes.bytes)
+                        << "round " << round << ": source " << from.width << "x" << from.height
+                        << " stride " << from.stride << ", scale " << scale << ", " << degrees
+                        << " degrees, shift " << shift;
+                }
+            }
+        }
+    }
 }
 
 INSTANTIATE_TEST_SUITE_P(EveryLaneWidthOfThisProcessor, SimpleImageMapLanesTest,

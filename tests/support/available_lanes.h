@@ -21,7 +21,7 @@ inline std::vector<BatchLanes const*> AvailableLanes() {
     return lanes;
 }
 
-/// Names a test of a lane width after the width ("sse2", "avx2", "avx512f").
+/// Names a test of a lane width after the width ("sse2", "avx2", "avx512").
 inline std::string LanesName(testing::TestParamInfo<BatchLanes const*> const& lanes) {
     return lanes.param->name;
 }
