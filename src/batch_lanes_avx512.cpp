@@ -174,13 +174,14 @@ struct Avx512Lane {
         for (; done + 16 <= row.blocks; done += 16) {
             __m512i const top_left = _mm512_loadu_si512(row.top + 4 * done);
             __m512i const top_right = _mm512_loadu_si512(row.top + 4 * done + 32);
-            // Whether any group of the sixteen blocks found no window.
-            bool const scattered = !LumaSixteen(top_left, row, row.top_out + 2 * done) |
-                                   !LumaSixteen(top_right, row, row.top_out + 2 * done + 16) |
-                                   !LumaSixteen(_mm512_loadu_si512(row.bottom + 4 * done), row,
-                                                row.bottom_out + 2 * done) |
-                                   !LumaSixteen(_mm512_loadu_si512(row.bottom + 4 * done + 32), row,
-                                                row.bottom_out + 2 * done + 16);
+            // How many groups of the sixteen blocks a window held: all four, or the row is
+            // scattered.
+            int const held = int(LumaSixteen(top_left, row, row.top_out + 2 * done)) +
+                             int(LumaSixteen(top_right, row, row.top_out + 2 * done + 16)) +
+                             int(LumaSixteen(_mm512_loadu_si512(row.bottom + 4 * done), row,
+                                             row.bottom_out + 2 * done)) +
+                             int(LumaSixteen(_mm512_loadu_si512(row.bottom + 4 * done + 32), row,
+                                             row.bottom_out + 2 * done + 16));
             // One pick for both chroma planes: they share sizes and indices.
             Pick const chroma =
                 Plan(ChromaLookups(top_left, top_right, row), row.chroma_stride, row.plane >> 2);
@@ -191,7 +192,7 @@ struct Avx512Lane {
             // Rows of a panorama or a wide view lie scattered over the source, and no window
             // holds their groups: the plain loop does those rows at least as fast, so a row whose
             // groups keep missing is left to it.
-            scattered_runs = scattered || !chroma.windowed ? scattered_runs + 1 : 0;
+            scattered_runs = held < 4 || !chroma.windowed ? scattered_runs + 1 : 0;
             if (scattered_runs == SCATTERED_RUNS_TO_LEAVE) {
                 done += 16;
                 break;
