@@ -193,8 +193,24 @@ uint64_t StateInUse() {
 // (the host's own among it) several times slower: every function leaves them clean.
 class WideLanesTest : public testing::TestWithParam<BatchLanes const*> {};
 
+// Under AddressSanitizer the instrumentation clears a large stack frame's shadow through the C
+// library after the function's own clean-up, and the library's string functions use registers 16
+// to 31 on purpose: those are watched in the other builds only.
+#if defined(__SANITIZE_ADDRESS__)
+constexpr bool INSTRUMENTED = true;
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+constexpr bool INSTRUMENTED = true;
+#else
+constexpr bool INSTRUMENTED = false;
+#endif
+#else
+constexpr bool INSTRUMENTED = false;
+#endif
+
 TEST_P(WideLanesTest, EveryFunctionLeavesTheWideRegistersClean) {
-    uint64_t const high_registers = std::string(GetParam()->name) == "avx512" ? 1u << 7 : 0;
+    bool const watch_high = std::string(GetParam()->name) == "avx512" && !INSTRUMENTED;
+    uint64_t const high_registers = watch_high ? 1u << 7 : 0;
     uint64_t const watched = (1u << 2) | (1u << 6) | high_registers;
     std::vector<float> x(40, 0.25f);
     std::vector<float> y(40, 0.5f);
