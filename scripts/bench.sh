@@ -22,10 +22,10 @@ done
 # Every benchmark with a counter of a comparison in turns, one line each.
 echo
 echo "== comparisons in turns (ratios: ours over the yardstick, or the speed-up)"
-awk '/(vexmap_share|vexmap_speedup|pan_over_steady|two_over_one|vector_speedup)=/ {
+awk '/(vexmap_share|vexmap_speedup|pan_over_steady|two_over_one|vector_speedup|over_memcpy)=/ {
     line = sprintf("%-62s", $1)
     for (i = 2; i <= NF; ++i) {
-        if ($i ~ /^(vexmap_share|vexmap_speedup|pan_over_steady|two_over_one|vector_speedup|vexmap_ms|former_ms|opencv_ms|pan_ms|steady_ms|one_band_ms|two_bands_ms)=/) {
+        if ($i ~ /^(vexmap_share|vexmap_speedup|pan_over_steady|two_over_one|vector_speedup|over_memcpy|vexmap_ms|former_ms|opencv_ms|pan_ms|steady_ms|one_band_ms|two_bands_ms)=/) {
             line = line " " $i
         }
     }

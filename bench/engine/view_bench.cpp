@@ -8,9 +8,6 @@
 #include "bench_views.h"
 #include "in_turns.h"
 #include "reference_map.h"
-#include "vexmap/dual_panoramic_view.h"
-#include "vexmap/quad_ptz_view.h"
-#include "vexmap/single_panoramic_view.h"
 
 #ifdef VEXMAP_BENCH_WITH_OPENCV
 #include <opencv2/calib3d.hpp>
@@ -22,36 +19,8 @@ namespace {
 
 constexpr int TURNS = 15;
 
-enum ViewKind { PTZ, PANORAMA, DUAL_PANORAMA, QUAD };
-
 void SetPixels(benchmark::State& state, int width, int height) {
     state.SetItemsProcessed(int64_t(state.iterations()) * width * height);
-}
-
-// The PTZ view of the remap benchmarks; the panoramas and the quad view of the same lens on a
-// ceiling, cylindrical and rectilinear.
-boost::shared_ptr<View> MakeView(ViewKind kind, int width, int height) {
-    boost::shared_ptr<View> view;
-    switch (kind) {
-        case PTZ:
-            view.reset(new SinglePtzView(MakeBenchPtzView(width, height)));
-            return view;
-        case PANORAMA:
-            view.reset(
-                new SinglePanoramicView(MakeBenchCamera(DEWARP_INTERNAL_CAMERA_MOUNT_CEILING),
-                                        DEWARP_PROJECTION_CYLINDRICAL));
-            break;
-        case DUAL_PANORAMA:
-            view.reset(new DualPanoramicView(MakeBenchCamera(DEWARP_INTERNAL_CAMERA_MOUNT_CEILING),
-                                             DEWARP_PROJECTION_CYLINDRICAL));
-            break;
-        case QUAD:
-            view.reset(new QuadPtzView(MakeBenchCamera(DEWARP_INTERNAL_CAMERA_MOUNT_CEILING),
-                                       DEWARP_PROJECTION_RECTILINEAR));
-            break;
-    }
-    view->SetDewarpedSize(Resolution(float(width), float(height)));
-    return view;
 }
 
 // The builder that the view's BuildMap runs, timed by itself; then in turns with the former
