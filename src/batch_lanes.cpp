@@ -14,6 +14,7 @@ struct Sse2Lane {
     static constexpr int WIDTH = 4;
     static void Leave() {}
     static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const&) { return 0; }
+    static uint32_t RemapNv12Blocks(BatchLanes::Yuv420Row const&) { return 0; }
     static Pack Load(float const* p) { return _mm_loadu_ps(p); }
     static void Store(float* p, Pack v) { _mm_storeu_ps(p, v); }
     static Pack Fill(float v) { return _mm_set1_ps(v); }

@@ -55,6 +55,8 @@ struct Avx2Lane {
     static __m128i ChromaEight(__m256i index, __m256i inside, unsigned char const* plane) {
         return BytesAt(plane, index, inside, char(128));
     }
+    // NV12 goes through the plain loop here: its chroma pairs gain nothing from loads apart.
+    static uint32_t RemapNv12Blocks(BatchLanes::Yuv420Row const&) { return 0; }
     static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const& frame_row) {
         // A copy of its own: the output stores cannot alias it, so its fields stay in registers.
         BatchLanes::Yuv420Row const row = frame_row;

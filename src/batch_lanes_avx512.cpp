@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 #include <immintrin.h>
 #include <sleef.h>
 
@@ -67,20 +68,21 @@ struct Avx512Lane {
     };
     static constexpr uint32_t WINDOW_WIDTH = 32;
     static constexpr uint32_t WINDOW_ROWS = 4;
-    // The window starts at the lower of the first and the last lane's row, and 8 columns left of
-    // the lower of their columns, so that a group that runs either way, or bulges a little, fits.
-    // It must lie wholly within the plane's bytes (in 64 bits: a window never wraps as a 32-bit
-    // index may), and every lane that the plain test lets through must lie in it.
+    // The window starts at the lower of the first and the last lane's row, and `slack` columns
+    // left of the lower of their columns, so that a group that runs either way, or bulges a
+    // little, fits. It must lie wholly within the plane's bytes (in 64 bits: a window never wraps
+    // as a 32-bit index may), and every lane that the plain test lets through must lie in it with
+    // the `reach` bytes it reads.
     static Pick Plan(__m512i x, __m512i y, __m512i index, __mmask16 inside, uint32_t stride,
-                     uint32_t plane_bytes) {
+                     uint32_t plane_bytes, uint32_t reach = 1, uint32_t slack = 8) {
         Pick pick{false, 0, _mm_setzero_si128(), index, inside};
         // The lower of the first and the last lane, in every lane.
         auto const lower_end = [](__m512i v) {
             return _mm512_min_epu32(_mm512_broadcastd_epi32(_mm512_castsi512_si128(v)),
                                     _mm512_permutexvar_epi32(_mm512_set1_epi32(15), v));
         };
-        __m512i const eight = _mm512_set1_epi32(8);
-        __m512i const left = _mm512_sub_epi32(_mm512_max_epu32(lower_end(x), eight), eight);
+        __m512i const margin = _mm512_set1_epi32(int(slack));
+        __m512i const left = _mm512_sub_epi32(_mm512_max_epu32(lower_end(x), margin), margin);
         __m512i const top = lower_end(y);
         uint32_t const x0 = uint32_t(_mm_cvtsi128_si32(_mm512_castsi512_si128(left)));
         uint32_t const y0 = uint32_t(_mm_cvtsi128_si32(_mm512_castsi512_si128(top)));
@@ -90,9 +92,9 @@ struct Avx512Lane {
         }
         __m512i const dx = _mm512_sub_epi32(x, left);
         __m512i const dy = _mm512_sub_epi32(y, top);
-        __mmask16 const held =
-            _kand_mask16(_mm512_cmplt_epu32_mask(dx, _mm512_set1_epi32(int(WINDOW_WIDTH))),
-                         _mm512_cmplt_epu32_mask(dy, _mm512_set1_epi32(int(WINDOW_ROWS))));
+        __mmask16 const held = _kand_mask16(
+            _mm512_cmplt_epu32_mask(dx, _mm512_set1_epi32(int(WINDOW_WIDTH + 1 - reach))),
+            _mm512_cmplt_epu32_mask(dy, _mm512_set1_epi32(int(WINDOW_ROWS))));
         if (_kandn_mask16(held, inside) != 0) {
             return pick;
         }
@@ -163,7 +165,69 @@ struct Avx512Lane {
     static Pick Plan(Lookups const& lookups, uint32_t stride, uint32_t plane_bytes) {
         return Plan(lookups.x, lookups.y, lookups.index, lookups.inside, stride, plane_bytes);
     }
-    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const& frame_row) {
+    // The U and V of sixteen blocks in their planes.
+    static void Yuv420ChromaSixteen(__m512i top_left, __m512i top_right,
+                                    BatchLanes::Yuv420Row const& row, uint32_t first) {
+        // One pick for both planes: they share sizes and indices.
+        Pick const chroma =
+            Plan(ChromaLookups(top_left, top_right, row), row.chroma_stride, row.plane >> 2);
+        _mm_storeu_si128(reinterpret_cast<__m128i*>(row.u_out + first),
+                         Read(row.u_plane, row.chroma_stride, chroma, char(128)));
+        _mm_storeu_si128(reinterpret_cast<__m128i*>(row.v_out + first),
+                         Read(row.v_plane, row.chroma_stride, chroma, char(128)));
+    }
+    // The U V pairs of sixteen blocks, from each block's top left entry: at the index
+    // ((y >> 1) * stride + x) with bit 0 cleared, 128 128 where the plain test fails (it asks the
+    // pair's V to lie inside too). A pair's column in its row is that index less the row's start,
+    // x or x - 1; a window must hold both bytes.
+    static void Nv12ChromaSixteen(__m512i top_left, __m512i top_right,
+                                  BatchLanes::Yuv420Row const& row, uint32_t first) {
+        __m512i const even =
+            _mm512_setr_epi32(0, 2, 4, 6, 8, 10, 12, 14, 16, 18, 20, 22, 24, 26, 28, 30);
+        __m512i const corners = _mm512_permutex2var_epi32(top_left, even, top_right);
+        __m512i const x = _mm512_and_si512(corners, _mm512_set1_epi32(0xFFFF));
+        __m512i const chroma_y = _mm512_srli_epi32(corners, 17);
+        __m512i const row_start = _mm512_mullo_epi32(chroma_y, _mm512_set1_epi32(int(row.stride)));
+        __m512i const index =
+            _mm512_and_si512(_mm512_add_epi32(row_start, x), _mm512_set1_epi32(~1));
+        uint32_t const limit = row.plane >> 1;
+        __mmask16 const inside =
+            _kand_mask16(_mm512_cmplt_epu32_mask(_mm512_add_epi32(index, _mm512_set1_epi32(1)),
+                                                 _mm512_set1_epi32(int(limit))),
+                         _mm512_cmplt_epu32_mask(x, _mm512_set1_epi32(int(row.width))));
+        Pick const pick =
+            Plan(_mm512_sub_epi32(index, row_start), chroma_y, index, inside, row.stride, limit, 2);
+        unsigned char* const target = row.u_out + 2 * first;
+        if (!pick.windowed) {
+            alignas(64) uint32_t at[16];
+            _mm512_store_si512(at, _mm512_maskz_mov_epi32(inside, index));
+            static constexpr unsigned char BLACK_PAIR[2] = {128, 128};
+            for (uint32_t block = 0; block < 16; ++block) {
+                bool const lookup = ((inside >> block) & 1u) != 0;
+                std::memcpy(target + 2 * block, lookup ? row.u_plane + at[block] : BLACK_PAIR, 2);
+            }
+            return;
+        }
+        unsigned char const* window = row.u_plane + pick.start;
+        auto const load = [&](uint32_t k) {
+            return _mm256_loadu_si256(
+                reinterpret_cast<__m256i const*>(window + size_t(k) * row.stride));
+        };
+        __m512i const upper = _mm512_inserti64x4(_mm512_castsi256_si512(load(0)), load(1), 1);
+        __m512i const lower = _mm512_inserti64x4(_mm512_castsi256_si512(load(2)), load(3), 1);
+        // Each lane's place and the byte after it, as the two bytes of one 16-bit lane.
+        __m256i const places = _mm256_cvtepu8_epi16(pick.place);
+        __m256i const pairs = _mm256_or_si256(
+            places, _mm256_slli_epi16(_mm256_add_epi16(places, _mm256_set1_epi16(1)), 8));
+        __m512i const samples =
+            _mm512_permutex2var_epi8(upper, _mm512_castsi256_si512(pairs), lower);
+        _mm256_storeu_si256(reinterpret_cast<__m256i*>(target),
+                            _mm256_mask_blend_epi16(inside, _mm256_set1_epi16(int16_t(0x8080)),
+                                                    _mm512_castsi512_si256(samples)));
+    }
+    // Sixteen blocks at a time: the luma of their two rows, then their chroma through `chroma`.
+    template <typename ChromaSixteen>
+    static uint32_t RemapBlocks(BatchLanes::Yuv420Row const& frame_row, ChromaSixteen chroma) {
         // A copy of its own: the output stores cannot alias it, so its fields stay in registers.
         BatchLanes::Yuv420Row const row = frame_row;
         if (row.plane < 64 || row.plane >= 0x80000000u) {
@@ -174,25 +238,19 @@ struct Avx512Lane {
         for (; done + 16 <= row.blocks; done += 16) {
             __m512i const top_left = _mm512_loadu_si512(row.top + 4 * done);
             __m512i const top_right = _mm512_loadu_si512(row.top + 4 * done + 32);
-            // How many groups of the sixteen blocks a window held: all four, or the row is
-            // scattered.
+            // How many luma groups of the sixteen blocks a window held: all four, or the row is
+            // scattered. A chroma group that no window holds is read sample by sample.
             int const held = int(LumaSixteen(top_left, row, row.top_out + 2 * done)) +
                              int(LumaSixteen(top_right, row, row.top_out + 2 * done + 16)) +
                              int(LumaSixteen(_mm512_loadu_si512(row.bottom + 4 * done), row,
                                              row.bottom_out + 2 * done)) +
                              int(LumaSixteen(_mm512_loadu_si512(row.bottom + 4 * done + 32), row,
                                              row.bottom_out + 2 * done + 16));
-            // One pick for both chroma planes: they share sizes and indices.
-            Pick const chroma =
-                Plan(ChromaLookups(top_left, top_right, row), row.chroma_stride, row.plane >> 2);
-            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.u_out + done),
-                             Read(row.u_plane, row.chroma_stride, chroma, char(128)));
-            _mm_storeu_si128(reinterpret_cast<__m128i*>(row.v_out + done),
-                             Read(row.v_plane, row.chroma_stride, chroma, char(128)));
+            chroma(top_left, top_right, row, done);
             // Rows of a panorama or a wide view lie scattered over the source, and no window
             // holds their groups: the plain loop does those rows at least as fast, so a row whose
             // groups keep missing is left to it.
-            scattered_runs = held < 4 || !chroma.windowed ? scattered_runs + 1 : 0;
+            scattered_runs = held < 4 ? scattered_runs + 1 : 0;
             if (scattered_runs == SCATTERED_RUNS_TO_LEAVE) {
                 done += 16;
                 break;
@@ -200,6 +258,12 @@ struct Avx512Lane {
         }
         Leave();
         return done;
+    }
+    static uint32_t RemapYuv420Blocks(BatchLanes::Yuv420Row const& row) {
+        return RemapBlocks(row, &Yuv420ChromaSixteen);
+    }
+    static uint32_t RemapNv12Blocks(BatchLanes::Yuv420Row const& row) {
+        return RemapBlocks(row, &Nv12ChromaSixteen);
     }
     static Pack Load(float const* p) { return _mm512_loadu_ps(p); }
     static void Store(float* p, Pack v) { _mm512_storeu_ps(p, v); }

@@ -171,7 +171,7 @@ void SimpleImageMap::RemapRows(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& desti
             RemapYuv411Planar(source, destination, rows);
             return;
         case DEWARP_IMAGE_FORMAT_NV420_PLANAR:
-            RemapNv420Planar(source, destination, rows);
+            RemapNv420Planar(source, destination, rows, BatchLanes::Widest());
             return;
         default:
             Log::err(__LINE__, __FILE__, "Remap", "Unknown image format %d\n",
@@ -244,6 +244,8 @@ void SimpleImageMap::RemapWithLanes(BatchLanes const& lanes, _DEWARP_IMAGE const
                                     _DEWARP_IMAGE& destination) const {
     if (source.info.format == DEWARP_IMAGE_FORMAT_YUV420_PLANAR) {
         RemapYuv420Planar(source, destination, ALL_ROWS, lanes);
+    } else if (source.info.format == DEWARP_IMAGE_FORMAT_NV420_PLANAR) {
+        RemapNv420Planar(source, destination, ALL_ROWS, lanes);
     } else {
         Remap(source, destination);
     }
@@ -256,7 +258,7 @@ void SimpleImageMap::RemapYuv411Planar(_DEWARP_IMAGE const& source,
 
 void SimpleImageMap::RemapNv420Planar(_DEWARP_IMAGE const& source,
                                       _DEWARP_IMAGE& destination) const {
-    RemapNv420Planar(source, destination, ALL_ROWS);
+    RemapNv420Planar(source, destination, ALL_ROWS, BatchLanes::Widest());
 }
 
 // Sizes and bounds compare as signed 32-bit values here: a destination width or height of 2^31 or
@@ -515,7 +517,7 @@ void SimpleImageMap::RemapYuv411Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAG
 }
 
 void SimpleImageMap::RemapNv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
-                                      Rows band) const {
+                                      Rows band, BatchLanes const& lanes) const {
     Frame const in(source);
     Frame const out(destination);
     uint32_t const block_columns = out.width >> 1;
@@ -536,7 +538,15 @@ void SimpleImageMap::RemapNv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE
         unsigned char* top_out = destination.data + row * out.stride;
         unsigned char* bottom_out = top_out + out.stride;
         unsigned char* target = chroma_out + block_row * out.stride;
-        for (uint32_t column = 0; column < block_columns;
+        uint32_t const done = lanes.remap_nv12_blocks(BatchLanes::Yuv420Row{
+            top, bottom, block_columns, luma, chroma, nullptr, in.width, in.stride, in.plane,
+            in.stride, top_out, bottom_out, target, nullptr});
+        top += 4 * done;
+        bottom += 4 * done;
+        top_out += 2 * done;
+        bottom_out += 2 * done;
+        target += 2 * done;
+        for (uint32_t column = done; column < block_columns;
              ++column, top += 4, bottom += 4, top_out += 2, bottom_out += 2, target += 2) {
             LumaBlock(luma, in, top, bottom, top_out, bottom_out);
             uint32_t const x = top[0];

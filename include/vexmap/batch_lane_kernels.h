@@ -418,7 +418,8 @@ constexpr BatchLanes Table(char const* name, bool (*supported)()) {
          &C::MercatorToEquirectangularEntry, &C::LambertToEquirectangularEntry,
          &C::MillerToEquirectangularEntry, &C::ArchitecturalToEquirectangularEntry,
          &C::PanniniToEquirectangularEntry, &C::EquirectangularPanniniToEquirectangularEntry},
-        &L::RemapYuv420Blocks};
+        &L::RemapYuv420Blocks,
+        &L::RemapNv12Blocks};
 }
 
 }  // namespace quorvel::vexmap::lane_kernels

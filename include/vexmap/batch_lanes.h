@@ -7,7 +7,7 @@ namespace quorvel::vexmap {
 /// One width of vector lanes: the engine's kernels over arrays (the trigonometry of
 /// `BatchTrigonometry`, the links of `BatchChain`, the span store of the map builders, the 4:2:0
 /// remap), the same operations for SSE2 (4 lanes, every x86-64 processor), AVX2 with FMA (8) or
-/// AVX-512F (16). The wider tables are compiled for their instructions alone and may be called
+/// AVX-512 (16). The wider tables are compiled for their instructions alone and may be called
 /// only where the processor has them (`Supported`). Plain data; any thread.
 struct BatchLanes {
     /// One block row of SimpleImageMap::RemapYuv420Planar: the table rows of its two output rows,
@@ -77,11 +77,14 @@ struct BatchLanes {
                               float cx, float cy);
     ChainKernel chain[CHAIN_KIND_COUNT];
     /// Blocks of a Yuv420Row from the first on, as many as the lanes take at once, written as the
-    /// plain path writes them; returns how many, and the plain loop finishes the row. It reads up
-    /// to three bytes beyond a luma sample and before a chroma sample, inside the frame, so it
-    /// takes a row only when the plane holds at least 64 bytes and less than 2^31. The narrower
-    /// tables do none.
+    /// plain path writes them; returns how many, and the plain loop finishes the row. It reads
+    /// only bytes of the planes that it samples, and takes a row only when the luma plane holds at
+    /// least 64 bytes and less than 2^31. The SSE2 table does none.
     uint32_t (*remap_yuv420_blocks)(Yuv420Row const& row);
+    /// The same for SimpleImageMap::RemapNv420Planar, through the same record: `u_plane` is the
+    /// plane of U V pairs, `chroma_stride` its row's bytes (the luma stride), `u_out` the block
+    /// row's pairs; `v_plane` and `v_out` are not read. Only the AVX-512 table does any.
+    uint32_t (*remap_nv12_blocks)(Yuv420Row const& row);
 
     static BatchLanes const& Sse2();
     static BatchLanes const& Avx2();

@@ -59,7 +59,8 @@ public:
     /// runs past the destination, or for an unknown format. No rows is a band too.
     bool RemapRows(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, uint64_t first_row,
                    uint64_t row_count) const;
-    /// Remap through the vector kernels of the given lanes, the plain loop finishing each row,
+    /// Remap through the vector kernels of the given lanes (4:2:0 and NV12; the other layouts have
+    /// the plain path only), the plain loop finishing each row,
     /// where Remap takes the widest lanes of the processor: the narrowest table runs the plain
     /// path alone, so that tests can hold each width to it.
     void RemapWithLanes(BatchLanes const& lanes, _DEWARP_IMAGE const& source,
@@ -93,7 +94,8 @@ private:
                            BatchLanes const& lanes) const;
     void RemapYuv411Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination,
                            Rows rows) const;
-    void RemapNv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, Rows rows) const;
+    void RemapNv420Planar(_DEWARP_IMAGE const& source, _DEWARP_IMAGE& destination, Rows rows,
+                          BatchLanes const& lanes) const;
     size_t TableBytes() const;  // what SetMapSize allocated for the present sizes
 };
 

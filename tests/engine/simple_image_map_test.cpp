@@ -1231,11 +1231,16 @@ namespace {
 
 class SimpleImageMapLanesTest : public testing::TestWithParam<BatchLanes const*> {};
 
+// The layouts that have vector kernels.
+constexpr _DEWARP_IMAGE_FORMAT VECTOR_LAYOUTS[] = {DEWARP_IMAGE_FORMAT_YUV420_PLANAR,
+                                                   DEWARP_IMAGE_FORMAT_NV420_PLANAR};
+
 // Random tables (inside, on the edges, past them, unmapped) over random sizes and strides: every
 // lane width writes the frame that the plain path writes, byte for byte, and nothing else.
 TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathByteForByte) {
     std::mt19937 random(23);
-    for (int round = 0; round < 60; ++round) {
+    for (int round = 0; round < 120; ++round) {
+        _DEWARP_IMAGE_FORMAT const format = VECTOR_LAYOUTS[round % 2];
         std::uniform_int_distribution<int> side(1, 90);
         uint32_t const source_width = uint32_t(side(random)) + 1;
         uint32_t const source_height = uint32_t(side(random)) + 1;
@@ -1255,17 +1260,14 @@ TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathByteForByte) {
                 Set(map, column, row, ex, ey);
             }
         }
-        Picture const source =
-            Numbered(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, source_width, source_height, source_stride);
-        Picture plain(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, size_t(width), size_t(height),
-                      size_t(width) + 3);
-        Picture lanes(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, size_t(width), size_t(height),
-                      size_t(width) + 3);
+        Picture const source = Numbered(format, source_width, source_height, source_stride);
+        Picture plain(format, size_t(width), size_t(height), size_t(width) + 3);
+        Picture lanes(format, size_t(width), size_t(height), size_t(width) + 3);
         map.RemapWithLanes(BatchLanes::Sse2(), source.image, plain.image);
         map.RemapWithLanes(*GetParam(), source.image, lanes.image);
         ASSERT_EQ(plain.bytes, lanes.bytes)
-            << "round " << round << ": " << width << "x" << height << " from " << source_width
-            << "x" << source_height << " stride " << source_stride;
+            << NameOf(format) << " round " << round << ": " << width << "x" << height << " from "
+            << source_width << "x" << source_height << " stride " << source_stride;
     }
 }
 
@@ -1278,12 +1280,14 @@ TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathForALargeView) {
                 static_cast<unsigned short>(row * 2 + column / 11));
         }
     }
-    Picture const source = Numbered(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, 2880, 2880, 2880);
-    Picture plain(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, 1920, 1080, 1920);
-    Picture lanes(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, 1920, 1080, 1920);
-    map.RemapWithLanes(BatchLanes::Sse2(), source.image, plain.image);
-    map.RemapWithLanes(*GetParam(), source.image, lanes.image);
-    EXPECT_TRUE(plain.bytes == lanes.bytes);
+    for (_DEWARP_IMAGE_FORMAT const format : VECTOR_LAYOUTS) {
+        Picture const source = Numbered(format, 2880, 2880, 2880);
+        Picture plain(format, 1920, 1080, 1920);
+        Picture lanes(format, 1920, 1080, 1920);
+        map.RemapWithLanes(BatchLanes::Sse2(), source.image, plain.image);
+        map.RemapWithLanes(*GetParam(), source.image, lanes.image);
+        EXPECT_TRUE(plain.bytes == lanes.bytes) << NameOf(format);
+    }
 }
 
 // Tables as views make them: neighbouring entries close together, turned, scaled and shifted so
@@ -1296,13 +1300,15 @@ TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathForSmoothTablesOverE
         uint32_t height;
         uint32_t stride;
     };
-    Source const sources[] = {{200, 150, 200}, {200, 150, 203}, {30, 90, 30}, {64, 8, 70}};
+    Source const sources[] = {
+        {200, 150, 200}, {200, 150, 203}, {30, 90, 30}, {64, 8, 70}, {101, 61, 101}};
     int const width = 96;
     int const height = 64;
     int round = 0;
-    for (Source const& from : sources) {
-        Picture const source =
-            Numbered(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, from.width, from.height, from.stride);
+    for (int pass = 0; pass < 2 * 5; ++pass) {
+        _DEWARP_IMAGE_FORMAT const format = VECTOR_LAYOUTS[pass % 2];
+        Source const& from = sources[pass / 2];
+        Picture const source = Numbered(format, from.width, from.height, from.stride);
         for (float const scale : {0.4f, 0.73f, 1.3f}) {
             for (float const degrees : {0.0f, 7.0f, 90.0f, 185.0f, 300.0f}) {
                 for (float const shift : {-40.0f, 0.0f, 0.7f, 1.0f}) {
@@ -1325,14 +1331,14 @@ TEST_P(SimpleImageMapLanesTest, WritesTheFrameOfThePlainPathForSmoothTablesOverE
                                          : static_cast<unsigned short>(std::lround(y) & 0xFFFF));
                         }
                     }
-                    Picture plain(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, width, height, width);
-                    Picture lanes(DEWARP_IMAGE_FORMAT_YUV420_PLANAR, width, height, width);
+                    Picture plain(format, width, height, width);
+                    Picture lanes(format, width, height, width);
                     map.RemapWithLanes(BatchLanes::Sse2(), source.image, plain.image);
                     map.RemapWithLanes(*GetParam(), source.image, lanes.image);
                     ASSERT_EQ(plain.bytes, lanes.bytes)
-                        << "round " << round << ": source " << from.width << "x" << from.height
-                        << " stride " << from.stride << ", scale " << scale << ", " << degrees
-                        << " degrees, shift " << shift;
+                        << NameOf(format) << " round " << round << ": source " << from.width << "x"
+                        << from.height << " stride " << from.stride << ", scale " << scale << ", "
+                        << degrees << " degrees, shift " << shift;
                 }
             }
         }
