@@ -49,7 +49,7 @@ Lookups Decode(uint32_t const* entries, Source const& in) {
 // Eight pixels loaded one by one (on some processors, Zen 4, a gather costs more than its loads
 // apart), a lane outside the input reading the first pixel and then cleared to zero, which is
 // black in every channel.
-__m256i Gather(Source const& in, Lookups const& lookups) {
+__m256i LoadEight(Source const& in, Lookups const& lookups) {
     alignas(32) int offsets[LANES];
     _mm256_store_si256(reinterpret_cast<__m256i*>(offsets),
                        _mm256_and_si256(lookups.offsets, lookups.inside));
@@ -57,8 +57,9 @@ __m256i Gather(Source const& in, Lookups const& lookups) {
     for (int lane = 0; lane < LANES; ++lane) {
         memcpy(&pixels[lane], in.data + offsets[lane], 4);
     }
-    return _mm256_and_si256(_mm256_loadu_si256(reinterpret_cast<__m256i const*>(pixels)),
-                            lookups.inside);
+    __m256i const loaded = _mm256_setr_epi32(pixels[0], pixels[1], pixels[2], pixels[3], pixels[4],
+                                             pixels[5], pixels[6], pixels[7]);
+    return _mm256_and_si256(loaded, lookups.inside);
 }
 
 // A map's lookups run over the input in curves that the processor's own prefetching cannot
@@ -90,7 +91,7 @@ int Nearest4(Source const& in, Row const& row) {
     int column = 0;
     for (; column + LANES <= row.width; column += LANES) {
         PrefetchAhead(in, row, column, 1);
-        __m256i const pixels = Gather(in, Decode(row.entries + column, in));
+        __m256i const pixels = LoadEight(in, Decode(row.entries + column, in));
         _mm256_storeu_si256(reinterpret_cast<__m256i*>(row.pixels + 4 * column), pixels);
     }
     return column;
@@ -117,7 +118,7 @@ int Nearest3(Source const& in, Row const& row) {
         if (!_mm256_testz_si256(past, past)) {
             break;
         }
-        __m256i const pixels = _mm256_shuffle_epi8(Gather(in, lookups), pack);
+        __m256i const pixels = _mm256_shuffle_epi8(LoadEight(in, lookups), pack);
         unsigned char* const target = row.pixels + 3 * column;
         _mm_storeu_si128(reinterpret_cast<__m128i*>(target), _mm256_castsi256_si128(pixels));
         _mm_storeu_si128(reinterpret_cast<__m128i*>(target + 12),
